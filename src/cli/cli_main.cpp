@@ -1,0 +1,96 @@
+// verrant-cli: the checks without windows, for scripts and modpack builds. Reports are written
+// byte for byte as the desktop program writes them; exit status 0 nothing found, 1 findings,
+// 2 bad usage or a catalogue or report that could not be read or written.
+#include "checks/doubled_objects.h"
+#include "cli/cli_options.h"
+#include "platform/headless/headless.h"
+#include "shell/app_state.h"
+#include "shell/progress_list.h"
+
+#include <cstdio>
+#include <filesystem>
+#include <functional>
+
+namespace {
+
+struct CliCommand {
+    const char* name;
+    const char* summary;
+    std::function<CommandResult(const CliOptions&)> run;
+};
+
+const CliCommand Commands[] = {
+    {"doubled-objects", "building headers whose section names occur more than once",
+     [](const CliOptions&) { return FindDoubledObjects(); }},
+};
+
+const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
+
+void PrintHelp(std::FILE* to) {
+    std::fprintf(to,
+                 "usage: verrant-cli COMMAND --catalogue DIR [--report-dir DIR] [--progress]\n"
+                 "  --catalogue DIR   the folder that holds static.ini\n"
+                 "  --report-dir DIR  where the report is written (default: the current folder)\n"
+                 "  --progress        print the progress list's lines to standard output\n"
+                 "commands:\n");
+    for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
+}
+
+// The program's own form of a host folder: absolute, "\" separators, ending in "\".
+std::string ProgramFolder(const std::string& hostFolder) {
+    std::string folder = HeadlessProgramPath(hostFolder);
+    if (folder.empty() || folder.back() != '\\') folder += '\\';
+    return folder;
+}
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    CliOptions options;
+    std::string error;
+    if (!ParseCliOptions(std::vector<std::string>(argv + 1, argv + argc), options, error)) {
+        std::fprintf(stderr, "verrant-cli: %s\n", error.c_str());
+        PrintHelp(stderr);
+        return ExitTrouble;
+    }
+    if (options.help) {
+        PrintHelp(stdout);
+        return ExitNothingFound;
+    }
+    const CliCommand* chosen = nullptr;
+    for (const CliCommand& command : Commands)
+        if (options.command == command.name) chosen = &command;
+    if (!chosen) {
+        std::fprintf(stderr, "verrant-cli: unknown command %s\n", options.command.c_str());
+        PrintHelp(stderr);
+        return ExitTrouble;
+    }
+
+    ClearAppState();
+    StartFolder = ProgramFolder(".");
+    if (!options.catalogue.empty()) CatalogueFolder = ProgramFolder(options.catalogue);
+    std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
+    std::error_code fsError;
+    if (!std::filesystem::is_directory(reportDir, fsError)) {
+        std::fprintf(stderr, "verrant-cli: report folder %s does not exist\n", reportDir.c_str());
+        return ExitTrouble;
+    }
+    HeadlessSetDesktopFolder(ProgramFolder(reportDir));
+    HeadlessEcho(options.progress, true);
+    if (options.progress) {
+        ProgressListOn = true;
+        OpenProgressList();
+    }
+
+    CommandResult result = chosen->run(options);
+    std::fflush(stdout);
+    switch (result) {
+        case CommandResult::NothingFound: return ExitNothingFound;
+        case CommandResult::Findings: return ExitFindings;
+        case CommandResult::NoFolder:
+            std::fprintf(stderr, "verrant-cli: no catalogue folder: give --catalogue DIR\n");
+            return ExitTrouble;
+        case CommandResult::Failed: return ExitTrouble;
+    }
+    return ExitTrouble;
+}

@@ -1,0 +1,18 @@
+#include "shell/progress_list.h"
+
+#include "platform/platform.h"
+#include "shell/app_state.h"
+
+void OpenProgressList() {
+    ProgressWindow = OpenTopWindow("List searching window", 650, 320, 370, 470, FrameStyle{});
+    ProgressList = AddListControl(ProgressWindow, 10, 20, 350, 430, 1);
+}
+
+void CloseProgressList() {
+    CloseTopWindow(ProgressWindow);
+    ProgressWindow = ProgressList = 0;
+}
+
+void ClearProgressList() { ClearListControl(ProgressList); }
+
+void AddProgressLine(const std::string& text) { AppendListLine(ProgressList, text); }

@@ -1,0 +1,88 @@
+#include "shell/reports.h"
+
+#include "shell/messages.h"
+
+namespace {
+
+const std::size_t ReportBlockSize = 1 << 16;
+
+void WritePending(ReportFile& report) {
+    if (!report.pending.empty() && !WriteBytes(report.file, report.pending.data(), report.pending.size()))
+        report.failed = true;
+    report.pending.clear();
+}
+
+void TellReportFailure(const std::string& fileName) { ShowMessage("Report failure", "Can't write " + fileName); }
+
+}  // namespace
+
+std::string GetSpecialFolderPath(int folderId) {
+    if (folderId != 0) return "";
+    std::string path = DesktopFolderPath();
+    if (!path.empty() && path.back() != '\\') path += '\\';
+    return path;
+}
+
+std::string GetEnvironmentValue(const std::string& name) { return EnvironmentValue(name); }
+
+std::string WindowsFolder() {
+    std::string folder = GetEnvironmentValue("WINDIR");
+    return folder.empty() ? SystemWindowsFolder() : folder;
+}
+
+std::string GetReportFolder() { return GetSpecialFolderPath(0); }
+
+bool CreateReport(const std::string& fileName, ReportFile& report) {
+    report = ReportFile();
+    report.fileName = fileName;
+    std::string folder = GetReportFolder();
+    // Without a desktop the report goes to the current folder of the moment.
+    if (!folder.empty() && !MakeFolderCurrent(folder)) {
+        TellReportFailure(fileName);
+        return false;
+    }
+    report.file = CreateForWriting(fileName);
+    if (report.file == 0) {
+        TellReportFailure(fileName);
+        return false;
+    }
+    return true;
+}
+
+void WriteReportLine(ReportFile& report, const std::string& line) {
+    WriteReportText(report, line);
+    report.pending += "\r\n";
+}
+
+void WriteReportText(ReportFile& report, const std::string& text) {
+    if (report.file == 0) return;
+    report.pending += text;
+    if (report.pending.size() >= ReportBlockSize) WritePending(report);
+}
+
+bool FinishReport(ReportFile& report) {
+    if (report.file == 0) return false;
+    WritePending(report);
+    if (!CloseFile(report.file)) report.failed = true;
+    report.file = 0;
+    if (report.failed) {
+        TellReportFailure(report.fileName);
+        return false;
+    }
+    OpenReportInViewer(report.fileName);
+    return true;
+}
+
+void OpenReportInViewer(const std::string& fileName) { StartTextViewer(fileName, GetReportFolder()); }
+
+bool StartTextViewer(const std::string& fileName, const std::string& workingFolder) {
+    std::string viewer = WindowsFolder() + "\\notepad.exe";
+    if (StartProcess("\"" + viewer + "\" " + fileName, workingFolder)) return true;
+    std::string shellFolder = workingFolder;
+    if (shellFolder.empty()) shellFolder = viewer.substr(0, viewer.rfind('\\') + 1);
+    return ShellExecuteOpen(viewer, fileName, shellFolder);
+}
+
+void OpenCatalogueInViewer(const std::string& catalogueFolder) {
+    if (!StartTextViewer("static.ini", catalogueFolder)) ShowMessage("static.ini failure", "Can't open static.ini");
+}

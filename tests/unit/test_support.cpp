@@ -1,0 +1,69 @@
+#include "test_support.h"
+
+#include "platform/headless/headless.h"
+#include "shell/app_state.h"
+
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+
+namespace fs = std::filesystem;
+
+void ScratchTest::SetUp() {
+    const ::testing::TestInfo* info = ::testing::UnitTest::GetInstance()->current_test_info();
+    root = (fs::temp_directory_path() / "verrant-tests" / info->test_suite_name() / info->name()).string();
+    fs::remove_all(root);
+    fs::create_directories(root + "/Desktop");
+    HeadlessReset();
+    ClearAppState();
+    HeadlessSetDesktopFolder(Folder("Desktop"));
+    HeadlessSetEnvironment("WINDIR", "C:\\WINDOWS");
+}
+
+void ScratchTest::TearDown() {
+    HeadlessReset();
+    if (!HasFailure()) fs::remove_all(root);
+}
+
+std::string ScratchTest::Host(const std::string& relative) const { return root + "/" + relative; }
+
+std::string ScratchTest::Folder(const std::string& relative) const {
+    return HeadlessProgramPath(Host(relative)) + "\\";
+}
+
+void ScratchTest::Write(const std::string& relative, const std::string& bytes) const {
+    fs::path path = Host(relative);
+    fs::create_directories(path.parent_path());
+    std::ofstream(path, std::ios::binary) << bytes;
+}
+
+std::string ScratchTest::Read(const std::string& relative) const {
+    std::ifstream in(Host(relative), std::ios::binary);
+    std::ostringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+bool ScratchTest::Exists(const std::string& relative) const { return fs::exists(Host(relative)); }
+
+void ScratchTest::UseCatalogue(const std::string& bytes, const std::string& folder) {
+    Write(folder + "/static.ini", bytes);
+    CatalogueFolder = Folder(folder);
+}
+
+Strings ScratchTest::ProgressLines() const {
+    const HeadlessControl* list = HeadlessControlOf(ProgressList);
+    return list ? list->lines : Strings();
+}
+
+Strings ScratchTest::Messages() const {
+    Strings shown;
+    for (const ShownMessage& message : HeadlessMessages()) shown.push_back(message.title + ": " + message.text);
+    return shown;
+}
+
+std::string CrLf(const Strings& lines) {
+    std::string text;
+    for (const std::string& line : lines) text += line + "\r\n";
+    return text;
+}

@@ -1,0 +1,83 @@
+#!/usr/bin/env bash
+# Runs every test of Verrant and ends with one line "N passed, M failed".
+# Installs missing Debian packages first when run as root. FUZZ_SECONDS sets how long each fuzz
+# target runs (default 3).
+set -u
+cd "$(dirname "$0")/.."
+top=$(pwd)
+jobs=$(nproc 2>/dev/null || echo 2)
+
+packages=(cmake make g++ libgtest-dev googletest g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64
+          wine wine64 fonts-wine fonts-dejavu-core xvfb xauth imagemagick x11-utils
+          clang libclang-rt-14-dev)
+missing=()
+for package in "${packages[@]}"; do
+    dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
+done
+if [ ${#missing[@]} -gt 0 ]; then
+    if [ "$(id -u)" = 0 ]; then
+        echo "Installing: ${missing[*]}"
+        apt-get update -qq && DEBIAN_FRONTEND=noninteractive apt-get install -y -qq "${missing[@]}" >/dev/null
+    else
+        echo "Missing packages (run as root to install them): ${missing[*]}"
+    fi
+fi
+
+passed=0
+failed=0
+pass() { passed=$((passed + 1)); echo "PASS: $1"; }
+fail() { failed=$((failed + 1)); echo "FAIL: $1"; }
+# Adds the counts of a closing "N passed, M failed" line from a suite's output file.
+add_counts() {
+    local line
+    line=$(grep -E '^[0-9]+ passed, [0-9]+ failed' "$1" | tail -n 1)
+    if [ -z "$line" ]; then fail "$2 (no result line)"; return; fi
+    passed=$((passed + $(echo "$line" | cut -d' ' -f1)))
+    failed=$((failed + $(echo "$line" | cut -d' ' -f3)))
+    echo "$2: $line"
+}
+
+logs="$top/build/logs"
+mkdir -p "$logs"
+
+# Native: core, headless platform, verrant-cli and unit tests under the sanitizers.
+if cmake -S . -B build/native -DCMAKE_BUILD_TYPE=Debug -DVERRANT_SANITIZE=ON -DVERRANT_WERROR=ON \
+        >"$logs/native-configure.log" 2>&1 &&
+    cmake --build build/native -j"$jobs" >"$logs/native-build.log" 2>&1; then
+    pass "native build"
+    (cd build/native && ctest -j"$jobs" --timeout 300 >"$logs/unit.log" 2>&1)
+    summary=$(grep -E 'tests passed, [0-9]+ tests failed out of [0-9]+' "$logs/unit.log" | tail -n 1)
+    if [ -n "$summary" ]; then
+        total=$(echo "$summary" | sed -E 's/.* out of ([0-9]+).*/\1/')
+        bad=$(echo "$summary" | sed -E 's/.* ([0-9]+) tests failed.*/\1/')
+        passed=$((passed + total - bad))
+        failed=$((failed + bad))
+        echo "unit and cli tests: $((total - bad)) passed, $bad failed"
+        grep -E '\*\*\*Failed|Not Run|Timeout' "$logs/unit.log" | sed 's/^/    /'
+    else
+        fail "unit tests (no ctest summary; see $logs/unit.log)"
+    fi
+else
+    fail "native build (see $logs/native-build.log)"
+    tail -n 30 "$logs/native-build.log"
+fi
+
+# Windows: the program, verrant-cli.exe and the end-to-end driver, warning-free.
+if cmake -S . -B build/mingw -DCMAKE_TOOLCHAIN_FILE=cmake/mingw-w64.cmake -DCMAKE_BUILD_TYPE=Release \
+        -DVERRANT_WERROR=ON >"$logs/mingw-configure.log" 2>&1 &&
+    cmake --build build/mingw -j"$jobs" >"$logs/mingw-build.log" 2>&1; then
+    pass "MinGW build"
+else
+    fail "MinGW build (see $logs/mingw-build.log)"
+    tail -n 30 "$logs/mingw-build.log"
+fi
+
+# Further suites print their own closing line.
+for suite in tests/e2e/run-e2e.sh tests/fuzz/run-fuzz.sh; do
+    [ -f "$suite" ] || continue
+    bash "$suite" >"$logs/$(basename "$suite" .sh).log" 2>&1
+    add_counts "$logs/$(basename "$suite" .sh).log" "$suite"
+done
+
+echo "$passed passed, $failed failed"
+[ "$failed" = 0 ]
