@@ -1,0 +1,519 @@
+#include "baselines.h"
+
+#include <cstdio>
+#include <cstring>
+#include <dirent.h>
+#include <functional>
+#include <string>
+#include <sys/stat.h>
+#include <vector>
+
+namespace {
+
+//--- reading, one byte at a time
+
+std::FILE* OpenRead(const std::string& path) { return std::fopen(path.c_str(), "rb"); }
+
+// Bytes up to CR, LF, NUL or the end; an LF after a CR goes with it.
+bool ReadPhysicalLine(std::FILE* file, std::string& line) {
+    line.clear();
+    int c = getc_unlocked(file);
+    if (c == EOF) return false;
+    while (c != EOF && c != '\r' && c != '\n' && c != '\0') {
+        line += static_cast<char>(c);
+        c = getc_unlocked(file);
+    }
+    if (c == '\r') {
+        int next = getc_unlocked(file);
+        if (next != '\n' && next != EOF) ungetc(next, file);
+    }
+    return true;
+}
+
+std::string Trim(const std::string& line) {
+    std::size_t first = line.find_first_not_of(' ');
+    if (first == std::string::npos) return "";
+    return line.substr(first, line.find_last_not_of(' ') - first + 1);
+}
+
+bool ReadCatalogueLine(std::FILE* file, std::string& line) {
+    if (!ReadPhysicalLine(file, line)) return false;
+    line = Trim(line);
+    return true;
+}
+
+bool Begins(const std::string& line, const char* prefix) { return line.compare(0, std::strlen(prefix), prefix) == 0; }
+
+std::string Lower(std::string text) {
+    for (char& c : text)
+        if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
+    return text;
+}
+
+std::string BracketCut(const std::string& header) {
+    std::size_t bracket = header.find(']', 1);
+    return header.substr(1, bracket == std::string::npos ? std::string::npos : bracket - 1);
+}
+
+std::string EndCut(const std::string& header) { return header.size() < 2 ? "" : header.substr(1, header.size() - 2); }
+
+//--- writing
+
+struct Report {
+    std::FILE* file = nullptr;
+    void Line(const std::string& text) {
+        std::fwrite(text.data(), 1, text.size(), file);
+        std::fwrite("\r\n", 1, 2, file);
+    }
+};
+
+bool OpenReport(const BaselineInput& input, const char* name, Report& report) {
+    report.file = std::fopen((input.reportFolder + "/" + name).c_str(), "wb");
+    return report.file != nullptr;
+}
+
+//--- the catalogue checks
+
+bool CountLines(const BaselineInput& input) {
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    static char block[1 << 16];
+    long long lines = 0;
+    bool afterCr = false;
+    for (std::size_t got; (got = std::fread(block, 1, sizeof block, file)) > 0;) {
+        for (std::size_t i = 0; i < got; ++i) {
+            char c = block[i];
+            if (c == '\n' && afterCr) {
+                afterCr = false;
+                continue;
+            }
+            afterCr = c == '\r';
+            lines += c == '\r' || c == '\n' || c == '\0';
+        }
+    }
+    std::fclose(file);
+    std::printf("%lld\n", lines);
+    return true;
+}
+
+std::vector<std::string> SectionNamesByBracket(std::FILE* file) {
+    std::vector<std::string> names;
+    std::string line;
+    while (ReadCatalogueLine(file, line))
+        if (Begins(line, "[bui")) names.push_back(BracketCut(line));
+    return names;
+}
+
+bool PairwiseDoubles(const BaselineInput& input) {
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    std::vector<std::string> names = SectionNamesByBracket(file);
+    std::fclose(file);
+    std::vector<std::string> found;
+    for (std::size_t i = 0; i < names.size(); ++i)
+        for (std::size_t k = i + 1; k < names.size(); ++k)
+            if (names[k] == names[i]) {
+                found.push_back("Double object (" + std::to_string(i) + ") => (" + std::to_string(k) + "): " + names[i]);
+                break;
+            }
+    if (found.empty()) return true;
+    Report report;
+    if (!OpenReport(input, "Doubled_objects.txt", report)) return false;
+    report.Line("Doubled objects in your static.ini:");
+    report.Line("");
+    for (const std::string& line : found) report.Line(line);
+    std::fclose(report.file);
+    return true;
+}
+
+const char* const RegularLinePrefixes[] = {
+    "/---",          "[_",     "Title",  "[buildings.House$", "Mesh",          "Body",
+    "Panzer",        "equals", "AddHeightLive", "AddHeightDead", "AlignToLand", "[***] ",
+    "Ignore",        "PAlign", "[buildings.Plate$", "(",         "[*",          "[air",
+    "/",             "[buildings.Furniture$", "[buildings.Mountain$"};
+
+bool PrefixTable(const BaselineInput& input) {
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    std::vector<std::string> found;
+    int entry = 0;
+    std::string line;
+    while (ReadCatalogueLine(file, line)) {
+        if (Begins(line, "[buil")) ++entry;
+        bool regular = false;
+        for (const char* prefix : RegularLinePrefixes)
+            if (Begins(line, prefix)) {
+                regular = true;
+                break;
+            }
+        if (!regular && !line.empty())
+            found.push_back("Irregular entry towards object " + std::to_string(entry) + ": " + line);
+    }
+    std::fclose(file);
+    if (found.empty()) return true;
+    Report report;
+    if (!OpenReport(input, "Irregular_entrys.txt", report)) return false;
+    report.Line("Irregular entrys in your static.ini:");
+    report.Line("");
+    for (const std::string& text : found) report.Line(text);
+    std::fclose(report.file);
+    return true;
+}
+
+bool BareKeys(const BaselineInput& input) {
+    Report report;
+    if (!OpenReport(input, "Empty_references.txt", report)) return false;
+    report.Line("Empty references in your static.ini");
+    report.Line("");
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    int ordinal = -1;
+    std::string section, line;
+    bool any = false;
+    while (ReadCatalogueLine(file, line)) {
+        if (Begins(line, "[bui")) {
+            ++ordinal;
+            section = EndCut(line);
+        } else if (line == "Mesh" || line == "MeshLive" || line == "MeshDead") {
+            if (line == "Mesh") report.Line("**************");
+            report.Line("Object " + std::to_string(ordinal));
+            report.Line(section);
+            report.Line("Empty reference: " + line);
+            any = true;
+        }
+    }
+    std::fclose(file);
+    if (!any) std::fputs("No empty references found in your static.ini", report.file);
+    std::fclose(report.file);
+    return true;
+}
+
+//--- the mesh reference run: an index sized to the physical lines, 42 exclusion passes
+
+struct MeshIndexEntry {
+    std::string title, sectionName;
+    int number = 0;
+    std::string mesh, meshLive, meshDead;
+    unsigned char meshFound = 0, meshLiveFound = 0, meshDeadFound = 0;
+};
+
+const char* const StandardTitles[] = {
+    "Title House", "Title HouseWinter", "Title Railroads", "Title Sea", "Title Furniture",
+    "Title GroundPlate", "Title WinterGroundPlate", "Title ConcretePlate", "Title BlankPlate", "Title PCPPlate",
+    "Title Pac_GrPlate", "Title Pac_SandPlate", "Title Vehicles", "Title Trains", "Title Houses of Piter",
+    "Title Winter Houses of Piter", "Title Petropavlovskaia", "Title Petropavlovskaia Winter",
+    "Title Kronstadt Summer", "Title Kronstadt Winter", "Title FinlandHouse", "Title FinlandHouseWinter",
+    "Title Racing", "Title DesertGroundPlate", "Title House Pacific", "Title DummyGuns", "Title Mountain",
+    "Title Houses of Kiev", "Title Houses of Kiev winter", "Title Houses of Norway", "Title Houses of Burma",
+    "Title Houses of 46", "Title Winter Houses of 46", "Title Castles of Slovakia", "Title Churches of Slovakia",
+    "Title Houses of Slovakia", "Title Industry of Slovakia", "Title Ruins of Slovakia", "Title Try Duby AF",
+    "Title Slovakia Obstacles", "Title Rumania", "Title Humans"};
+
+void SetMeshValue(const std::string& line, std::string& field) {
+    std::size_t at = Lower(line).find("3do");
+    if (at == std::string::npos) return;
+    field = line.substr(at);
+    for (char& c : field)
+        if (c == '/') c = '\\';
+}
+
+bool BuildMeshIndex(const BaselineInput& input, std::vector<MeshIndexEntry>& index, long long& last) {
+    std::string path = input.catalogueFolder + "/static.ini", line;
+    std::FILE* file = OpenRead(path);
+    if (!file) return false;
+    long long lines = 0;
+    while (ReadPhysicalLine(file, line)) ++lines;
+    std::fclose(file);
+    index.assign(static_cast<std::size_t>(lines + 2), MeshIndexEntry());
+    last = -1;
+    file = OpenRead(path);
+    if (!file) return false;
+    while (ReadCatalogueLine(file, line) && line != "[***]") {
+    }
+    std::string title;
+    ReadPhysicalLine(file, title);
+    while (ReadCatalogueLine(file, line)) {
+        if (line == "[***]") {
+            ReadCatalogueLine(file, title);
+        } else if (Begins(line, "[bui")) {
+            ++last;
+            MeshIndexEntry& entry = index[static_cast<std::size_t>(last)];
+            entry.title = title;
+            entry.sectionName = EndCut(line);
+            entry.number = static_cast<int>(last);
+        } else if (last >= 0 && Begins(line, "Mesh ")) {
+            SetMeshValue(line, index[static_cast<std::size_t>(last)].mesh);
+        } else if (last >= 0 && Begins(line, "MeshLive")) {
+            SetMeshValue(line, index[static_cast<std::size_t>(last)].meshLive);
+        } else if (last >= 0 && Begins(line, "MeshDead")) {
+            SetMeshValue(line, index[static_cast<std::size_t>(last)].meshDead);
+        }
+    }
+    std::fclose(file);
+    for (const char* standard : StandardTitles)
+        for (long long i = 0; i <= last; ++i)
+            if (index[static_cast<std::size_t>(i)].title == standard) index[static_cast<std::size_t>(i)].title = "";
+    return true;
+}
+
+void WriteMeshReportHeader(Report& report, const char* third) {
+    report.Line("Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked");
+    report.Line("Mod objects using sims/meshes of standard objects will cause wrong alert");
+    report.Line(third);
+    report.Line("");
+}
+
+bool SharedLiveDeadMeshes(const BaselineInput& input) {
+    std::vector<MeshIndexEntry> index;
+    long long last = -1;
+    if (!BuildMeshIndex(input, index, last)) return false;
+    Report report;
+    if (!OpenReport(input, "Doubled_sims_or_meshes.txt", report)) return false;
+    WriteMeshReportHeader(report, "Doubled used sims in your static.ini:");
+    const std::string stars(38, '*');
+    for (const char* line : {" ", stars.c_str(), "Using the same MeshLive/MeshDead", stars.c_str(), " "}) report.Line(line);
+    bool any = false;
+    for (long long i = 0; i <= last; ++i) {
+        const MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+        if (entry.title.empty() || entry.meshLive.empty() || entry.meshDead.empty() || entry.meshLive != entry.meshDead)
+            continue;
+        any = true;
+        report.Line("**************");
+        report.Line("Object (" + std::to_string(entry.number) + ")");
+        report.Line(entry.sectionName);
+        report.Line("MeshLive: " + entry.meshLive);
+        report.Line("MeshDead: " + entry.meshDead);
+    }
+    if (!any) report.Line("No doubled used Meshs found");
+    std::fclose(report.file);
+    return true;
+}
+
+bool IsFolder(const std::string& path) {
+    struct stat info;
+    return stat(path.c_str(), &info) == 0 && S_ISDIR(info.st_mode);
+}
+
+// Opens the file a mesh value names inside one mod folder; the value's "\" become "/".
+bool MeshFileOpens(const std::string& modFolder, const std::string& value) {
+    std::string path = modFolder + "/" + value;
+    for (char& c : path)
+        if (c == '\\') c = '/';
+    std::FILE* file = OpenRead(path);
+    if (!file) return false;
+    std::fclose(file);
+    return true;
+}
+
+bool OpenPerMeshPerFolder(const BaselineInput& input) {
+    std::vector<MeshIndexEntry> index;
+    long long last = -1;
+    if (!BuildMeshIndex(input, index, last)) return false;
+    DIR* mods = opendir(input.modsRoot.c_str());
+    long long opens = 0;
+    while (dirent* modEntry = mods ? readdir(mods) : nullptr) {
+        std::string modFolder = input.modsRoot + "/" + modEntry->d_name;
+        if (!IsFolder(modFolder)) continue;
+        DIR* mod = opendir(modFolder.c_str());
+        while (dirent* inner = mod ? readdir(mod) : nullptr) {
+            if (Lower(inner->d_name) != "3do" || !IsFolder(modFolder + "/" + inner->d_name)) continue;
+            for (long long i = 0; i <= last; ++i) {
+                MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+                if (entry.title.empty()) continue;
+                const std::pair<std::string*, unsigned char*> fields[] = {{&entry.mesh, &entry.meshFound},
+                                                                          {&entry.meshLive, &entry.meshLiveFound},
+                                                                          {&entry.meshDead, &entry.meshDeadFound}};
+                for (const auto& [value, found] : fields) {
+                    if (value->empty()) continue;
+                    ++opens;
+                    if (MeshFileOpens(modFolder, *value)) *found = 1;
+                }
+            }
+        }
+        if (mod) closedir(mod);
+    }
+    if (mods) closedir(mods);
+    Report report;
+    if (!OpenReport(input, "Missing_3do.txt", report)) return false;
+    WriteMeshReportHeader(report, "Wrong sim references in your static.ini:");
+    bool any = false;
+    for (long long i = 0; i <= last; ++i) {
+        const MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+        if (entry.title.empty()) continue;
+        std::string object = "Object (" + std::to_string(entry.number) + ")";
+        if (!entry.mesh.empty() && !entry.meshFound) {
+            for (const std::string& line : {std::string("**************"), object, entry.sectionName,
+                                            "Not found: Mesh " + entry.mesh})
+                report.Line(line);
+            any = true;
+        }
+        bool liveMissing = !entry.meshLive.empty() && !entry.meshLiveFound;
+        bool deadMissing = !entry.meshDead.empty() && !entry.meshDeadFound;
+        if (liveMissing || deadMissing) {
+            for (const std::string& line : {std::string("**************"), object, entry.sectionName,
+                                            liveMissing ? "Not found: MeshLive " + entry.meshLive
+                                                        : "Not found: MeshDead " + entry.meshDead})
+                report.Line(line);
+            any = true;
+        }
+    }
+    if (!any) report.Line("No wrong references found");
+    std::fclose(report.file);
+    std::printf("%lld opens\n", opens);
+    return true;
+}
+
+//--- the map check: names read from the map's first bytes, each looked up by a walk from the start
+
+bool LinearNameWalk(const BaselineInput& input) {
+    std::FILE* map = OpenRead(input.mapFile);
+    if (!map) return false;
+    std::vector<char> bytes(140000);
+    bytes.resize(std::fread(bytes.data(), 1, bytes.size(), map));
+    std::fclose(map);
+    std::string text;
+    for (char byte : bytes) {
+        unsigned char value = static_cast<unsigned char>(byte);
+        if (value == 0) text += ' ';
+        else if (value >= 33 && value <= 122) text += byte;
+    }
+    std::vector<std::string> placed;
+    for (std::size_t at = text.find("build"); at != std::string::npos; at = text.find("build", at)) {
+        std::size_t blank = text.find(' ', at);
+        if (blank == std::string::npos) break;
+        placed.push_back(text.substr(at, blank - at));
+        at = blank;
+    }
+
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    std::vector<std::string> names = SectionNamesByBracket(file);
+    std::fclose(file);
+    std::vector<std::string> missing;
+    for (const std::string& name : placed) {
+        bool found = false;
+        for (std::size_t k = 0; k < names.size() && !found; ++k) found = names[k] == name;
+        if (!found) missing.push_back(name);
+    }
+    if (missing.empty()) return true;
+    Report report;
+    if (!OpenReport(input, "Missing_objects.txt", report)) return false;
+    report.Line("Missing objects in your static.ini:");
+    report.Line("");
+    for (const std::string& name : missing) report.Line(name);
+    std::fclose(report.file);
+    return true;
+}
+
+//--- rewriting: stream the catalogue through static.ini.tmp, once or twice
+
+bool RewritePass(const std::string& folder, const std::function<void(const std::string&, std::FILE*)>& each) {
+    std::string catalogue = folder + "/static.ini", temporary = folder + "/static.ini.tmp", line;
+    std::FILE* in = OpenRead(catalogue);
+    std::FILE* out = std::fopen(temporary.c_str(), "wb");
+    if (!in || !out) return false;
+    while (ReadPhysicalLine(in, line)) each(line, out);
+    std::fclose(in);
+    std::fclose(out);
+    return std::remove(catalogue.c_str()) == 0 && std::rename(temporary.c_str(), catalogue.c_str()) == 0;
+}
+
+void WriteLine(std::FILE* out, const std::string& line) {
+    std::fwrite(line.data(), 1, line.size(), out);
+    std::fwrite("\r\n", 1, 2, out);
+}
+
+bool DenumberPass(const BaselineInput& input) {
+    return RewritePass(input.catalogueFolder, [](const std::string& line, std::FILE* out) {
+        if (line.find_first_of("()") == std::string::npos) WriteLine(out, line);
+    });
+}
+
+bool RenumberPasses(const BaselineInput& input) {
+    if (!DenumberPass(input)) return false;
+    int n = 0;
+    return RewritePass(input.catalogueFolder, [&n](const std::string& line, std::FILE* out) {
+        if (Begins(line, "[bui")) {
+            std::string number = std::to_string(n++);
+            WriteLine(out, "(" + number + ")");
+        }
+        WriteLine(out, line);
+    });
+}
+
+//--- the mission-builder lists
+
+std::string ObjectName(const std::string& header) {
+    std::size_t dollar = header.find('$');
+    std::size_t start = dollar == std::string::npos ? 0 : dollar + 1;
+    std::size_t next = header.find('$', start);
+    std::string name = header.substr(start, next == std::string::npos ? std::string::npos : next - start);
+    if (!name.empty()) name.pop_back();
+    return name;
+}
+
+bool BuilderList(const BaselineInput& input, bool plus) {
+    struct Entry {
+        std::string groupTitle;
+        int number;
+        bool isPlate;
+        std::string objectName;
+    };
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    std::vector<Entry> entries;
+    std::string title, line;
+    int counter = -1;
+    while (ReadCatalogueLine(file, line)) {
+        std::string lower = Lower(line);
+        if (lower.find("$kust") != std::string::npos || lower.find("$suribachi") != std::string::npos) continue;
+        if (line == "[***]") {
+            if (!ReadPhysicalLine(file, title)) title.clear();
+        } else if (Begins(line, "[bui")) {
+            entries.push_back({title, ++counter, false, ObjectName(line)});
+            if (!plus && lower.find("plate") != std::string::npos) {
+                entries.back().isPlate = true;
+                --counter;
+            }
+        }
+    }
+    std::fclose(file);
+    Report report;
+    if (!OpenReport(input, plus ? "Static_list_FMBplus.txt" : "Static_list_FMB.txt", report)) return false;
+    report.Line(plus ? "Object list for fmb+" : "Object list for fmb");
+    report.Line("");
+    const std::string rule = std::string("//").append(41, '=');
+    std::string written;
+    for (const Entry& entry : entries) {
+        if (entry.isPlate) continue;
+        if (entry.groupTitle != written) {
+            for (const std::string& text : {rule, std::string("[***]"), entry.groupTitle, rule}) report.Line(text);
+            written = entry.groupTitle;
+        }
+        std::string number = std::to_string(entry.number);
+        report.Line("(" + number + ") " + entry.objectName);
+    }
+    std::fclose(report.file);
+    return true;
+}
+
+}  // namespace
+
+bool RunBaseline(const std::string& name, const BaselineInput& input) {
+    const std::pair<const char*, std::function<bool(const BaselineInput&)>> baselines[] = {
+        {"floor", CountLines},
+        {"pairwise", PairwiseDoubles},
+        {"prefix-table", PrefixTable},
+        {"bare-keys", BareKeys},
+        {"mesh-index", SharedLiveDeadMeshes},
+        {"open-per-mesh", OpenPerMeshPerFolder},
+        {"linear-walk", LinearNameWalk},
+        {"two-passes", RenumberPasses},
+        {"one-pass", DenumberPass},
+        {"entry-list", [](const BaselineInput& in) { return BuilderList(in, false); }},
+        {"entry-list-plus", [](const BaselineInput& in) { return BuilderList(in, true); }},
+    };
+    for (const auto& [baselineName, run] : baselines)
+        if (name == baselineName) return run(input);
+    return false;
+}

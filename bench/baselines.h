@@ -1,0 +1,16 @@
+// Straightforward versions of each command, written the way the command's own description reads
+// (pairwise walks, linear lookups, one open per mesh per folder), to measure the real commands
+// against. They share nothing with the program's code.
+#pragma once
+
+#include <string>
+
+struct BaselineInput {
+    std::string catalogueFolder;  // holds static.ini
+    std::string modsRoot;         // the mods folder
+    std::string mapFile;          // an actors.static
+    std::string reportFolder;     // where a baseline writes its report
+};
+
+// Runs the named baseline; false for an unknown name or a file it cannot read.
+bool RunBaseline(const std::string& name, const BaselineInput& input);
