@@ -17,16 +17,6 @@ const std::string TwoAs = "[buildings.House$A]\r\n[buildings.House$A]\r\n";
 
 HeadlessStep ToggleClick() { return ControlStep(Main, ProgressToggleId); }
 
-HeadlessStep ChooserOk() {
-    return [] {
-        Event event;
-        event.window = HeadlessFindWindow(Chooser);
-        event.kind = EventKind::Control;
-        event.control = HeadlessControlByKind(event.window, "push");
-        event.id = HeadlessControlOf(event.control)->id;
-        return event;
-    };
-}
 
 // The pending steps arrive while the command of the step runs, as clicks made during it would.
 HeadlessStep WhileRunning(std::vector<HeadlessStep> pending, HeadlessStep step) {
@@ -219,7 +209,7 @@ TEST_F(EventLoopTest, CommandsThatNeedTheFolderAskForIt) {
         }));
         HeadlessScript(c.command);
         HeadlessScript(BrowserStep(Chooser, catalogue, "static.ini", true));
-        HeadlessScript(ChooserOk());
+        HeadlessScript(ChooserOkStep());
         HeadlessScript(Look(c.expectDone));
         RunMainEventLoop();
         EXPECT_EQ(CatalogueFolder, catalogue);
