@@ -13,11 +13,15 @@ namespace {
 
 void RunMenuCommand(int id) {
     switch (id) {
-        case MenuDoubledObjects: FindDoubledObjects(); break;
+        case MenuDoubledObjects:
+            FindDoubledObjects();
+            break;
         case MenuSavePath:
             if (EnsureCatalogueFolderKnown()) SavePath(CatalogueFolder, StartFolder);
             break;
-        case MenuClearPath: ClearPath(); break;
+        case MenuClearPath:
+            ClearPath();
+            break;
         // Commands whose procedures come with their own units: one line each above when they land.
         case MenuMissingObjects:
         case MenuIrregularEntries:
@@ -27,9 +31,12 @@ void RunMenuCommand(int id) {
         case MenuRenumber:
         case MenuDenumber:
         case MenuListForFmb:
-        case MenuListForFmbPlus: break;
-        case MenuCredit: break;
-        default: break;
+        case MenuListForFmbPlus:
+            break;
+        case MenuCredit:
+            break;
+        default:
+            break;
     }
 }
 
@@ -45,8 +52,10 @@ void FollowProgressToggle() {
 void RunMainWindowEvent(Event& event) {
     ActivateTopWindow(MainWindow);
     if (event.kind == EventKind::MenuItem) {
-        if (event.id == MenuClose) event.kind = EventKind::CloseRequest;
-        else RunMenuCommand(event.id);
+        if (event.id == MenuClose)
+            event.kind = EventKind::CloseRequest;
+        else
+            RunMenuCommand(event.id);
     } else if (event.kind == EventKind::Control) {
         if (event.id == ProgressToggleId) FollowProgressToggle();
         if (event.id == OpenCatalogueButtonId && EnsureCatalogueFolderKnown())

@@ -17,7 +17,6 @@ const std::string TwoAs = "[buildings.House$A]\r\n[buildings.House$A]\r\n";
 
 HeadlessStep ToggleClick() { return ControlStep(Main, ProgressToggleId); }
 
-
 // The pending steps arrive while the command of the step runs, as clicks made during it would.
 HeadlessStep WhileRunning(std::vector<HeadlessStep> pending, HeadlessStep step) {
     return [=] {
@@ -35,7 +34,7 @@ HeadlessStep Look(std::function<void()> check) {
 }
 
 class EventLoopTest : public ScratchTest {
-protected:
+   protected:
     void SetUp() override {
         ScratchTest::SetUp();
         Write("start/readme.txt", "");

@@ -10,15 +10,19 @@ namespace {
 // sub-menu, in menu order.
 void FlattenMenu(Handle menu, const std::string& path, Strings& entries) {
     for (const HeadlessMenuItem& item : HeadlessMenuItems(menu)) {
-        if (item.separator) entries.push_back(path + "-");
-        else if (item.subMenu) FlattenMenu(item.subMenu, path + item.text + "/", entries);
-        else entries.push_back(path + item.text + "=" + std::to_string(item.id));
+        if (item.separator)
+            entries.push_back(path + "-");
+        else if (item.subMenu)
+            FlattenMenu(item.subMenu, path + item.text + "/", entries);
+        else
+            entries.push_back(path + item.text + "=" + std::to_string(item.id));
     }
 }
 
 std::string Geometry(const HeadlessControl& control) {
     return control.kind + " \"" + control.text + "\" " + std::to_string(control.left) + "," +
-           std::to_string(control.top) + " " + std::to_string(control.width) + "x" + std::to_string(control.height);
+           std::to_string(control.top) + " " + std::to_string(control.width) + "x" +
+           std::to_string(control.height);
 }
 
 }  // namespace
@@ -38,7 +42,8 @@ TEST_F(MainWindowTest, WindowAndButtons) {
 
     Strings controls;
     for (Handle control : window->controls) controls.push_back(Geometry(*HeadlessControlOf(control)));
-    EXPECT_EQ(controls, Strings({"push \"Open static.ini\" 5,15 80x22", "toggle \"List searching\" 5,50 80x22"}));
+    EXPECT_EQ(controls,
+              Strings({"push \"Open static.ini\" 5,15 80x22", "toggle \"List searching\" 5,50 80x22"}));
     EXPECT_EQ(HeadlessControlOf(OpenCatalogueButton)->id, OpenCatalogueButtonId);
     EXPECT_EQ(HeadlessControlOf(ProgressToggle)->id, ProgressToggleId);
     EXPECT_NE(OpenCatalogueButtonId, ProgressToggleId);

@@ -7,7 +7,7 @@
 namespace {
 
 class SettingsTest : public ScratchTest {
-protected:
+   protected:
     void SetUp() override {
         ScratchTest::SetUp();
         Write("start/readme.txt", "");
@@ -25,8 +25,8 @@ protected:
 }  // namespace
 
 TEST_F(SettingsTest, OnlyTheFirstLineNamesTheFolder) {
-    const Strings rests = {"", "\r\nD:\\other\\", "\nD:\\other\\", "\rD:\\other\\", std::string("\0tail", 5),
-                           "\r\n"};
+    const Strings rests = {
+        "", "\r\nD:\\other\\", "\nD:\\other\\", "\rD:\\other\\", std::string("\0tail", 5), "\r\n"};
     for (const std::string& rest : rests) {
         SCOPED_TRACE(rest);
         HeadlessReset();
@@ -138,7 +138,8 @@ TEST_F(SettingsTest, ClearTwiceDeletesThenHasNothingToClear) {
     EXPECT_EQ(CatalogueFolder, "");
     EXPECT_EQ(MapsPattern, "");
     ClearPath();
-    EXPECT_EQ(Messages(), Strings({"Path cleared: verrant.ini deleted", "Path cleared failure: Nothing to clear"}));
+    EXPECT_EQ(Messages(),
+              Strings({"Path cleared: verrant.ini deleted", "Path cleared failure: Nothing to clear"}));
 }
 
 TEST_F(SettingsTest, NothingClearedKeepsTheKnownFolder) {

@@ -9,11 +9,11 @@ namespace {
 
 const std::string Main = "Verrant V.1.3";
 const std::string Chooser = "Searching static.ini";
-const std::string Question = "Path to static.ini: Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first";
-
+const std::string Question =
+    "Path to static.ini: Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first";
 
 class StartupTest : public ScratchTest {
-protected:
+   protected:
     void SetUp() override {
         ScratchTest::SetUp();
         Write("start/readme.txt", "");
@@ -75,7 +75,8 @@ TEST_F(StartupTest, FolderThatCannotBeSavedServesThisRun) {
     HeadlessSetFileFaults(faults);
     ScriptChoosingTheCatalogue();
     EXPECT_EQ(RunVerrant(), 0);
-    EXPECT_EQ(Messages(), Strings({Question, "Path not saved: Can't write verrant.ini in " + Folder("start")}));
+    EXPECT_EQ(Messages(),
+              Strings({Question, "Path not saved: Can't write verrant.ini in " + Folder("start")}));
     EXPECT_FALSE(Exists("start/verrant.ini"));
     EXPECT_EQ(CatalogueFolder, catalogue);
     EXPECT_EQ(MapsPattern, Folder("Sim") + "Mods\\mapmods\\maps\\*.*");
