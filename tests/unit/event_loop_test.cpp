@@ -216,17 +216,6 @@ TEST_F(EventLoopTest, CommandsThatNeedTheFolderAskForIt) {
     }
 }
 
-TEST_F(EventLoopTest, OpenStaticIniWithAKnownFolderStartsTheViewer) {
-    CatalogueFolder = catalogue;
-    MakeFolderCurrent(Folder("start"));
-    HeadlessScript(ControlStep(Main, OpenCatalogueButtonId));
-    RunMainEventLoop();
-    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main}));
-    ASSERT_EQ(HeadlessProcesses().size(), 1u);
-    EXPECT_EQ(HeadlessProcesses()[0].commandLine, "\"C:\\WINDOWS\\notepad.exe\" static.ini");
-    EXPECT_EQ(HeadlessProcesses()[0].workingFolder, catalogue);
-}
-
 TEST_F(EventLoopTest, CreditItemAndUnusedIdsDoNothing) {
     Write("start/verrant.ini", catalogue);
     for (int id : {int(MenuCredit), 10, 0, 16}) HeadlessScript(MenuStep(Main, id));
