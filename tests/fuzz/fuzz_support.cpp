@@ -1,0 +1,87 @@
+#include "fuzz_support.h"
+
+#include "catalogue/catalogue_reader.h"
+#include "platform/headless/headless.h"
+#include "shell/app_state.h"
+
+#include <cstdio>
+#include <cstdlib>
+#include <filesystem>
+#include <fstream>
+#include <sstream>
+#include <unistd.h>
+
+namespace fs = std::filesystem;
+
+namespace {
+
+std::string HostScratch;
+
+void RemoveScratch() {
+    std::error_code error;
+    fs::remove_all(HostScratch, error);
+}
+
+}  // namespace
+
+const std::string& ScratchFolder() {
+    static std::string folder;
+    if (!folder.empty()) return folder;
+    std::error_code error;
+    fs::path base = fs::is_directory("/dev/shm", error) ? fs::path("/dev/shm") : fs::temp_directory_path(error);
+    HostScratch = (base / ("verrant-fuzz-" + std::to_string(getpid()))).string();
+    fs::create_directories(HostScratch + "/Desktop", error);
+    std::atexit(RemoveScratch);
+    folder = HeadlessProgramPath(HostScratch) + "\\";
+    return folder;
+}
+
+void ResetForInput() {
+    ScratchFolder();
+    HeadlessReset();
+    ClearAppState();
+    std::error_code error;
+    fs::remove_all(HostScratch + "/Desktop", error);
+    fs::create_directories(HostScratch + "/Desktop", error);
+    HeadlessSetDesktopFolder(ScratchFolder() + "Desktop\\");
+    HeadlessSetEnvironment("WINDIR", "C:\\WINDOWS");
+}
+
+void WriteScratchFile(const std::string& name, const std::string& bytes) {
+    ScratchFolder();
+    std::ofstream(HostScratch + "/" + name, std::ios::binary | std::ios::trunc) << bytes;
+}
+
+std::string ReadScratchFile(const std::string& name, bool& exists) {
+    ScratchFolder();
+    std::ifstream in(HostScratch + "/" + name, std::ios::binary);
+    exists = static_cast<bool>(in);
+    std::ostringstream text;
+    text << in.rdbuf();
+    return text.str();
+}
+
+std::string ReadDesktopFile(const std::string& name, bool& exists) { return ReadScratchFile("Desktop/" + name, exists); }
+
+void Require(bool holds, const char* what) {
+    if (holds) return;
+    std::fprintf(stderr, "property failed: %s\n", what);
+    std::abort();
+}
+
+std::vector<std::string> CatalogueLinesOf(const std::string& bytes, bool trimmed) {
+    WriteScratchFile("static.ini", bytes);
+    CatalogueReader reader;
+    std::vector<std::string> lines;
+    Require(OpenCatalogue(ScratchFolder(), reader), "the scratch catalogue opens");
+    std::string line;
+    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.push_back(line);
+    CloseCatalogue(reader);
+    return lines;
+}
+
+std::string CrLfText(const std::vector<std::string>& lines) {
+    std::string text;
+    for (const std::string& line : lines) text += line + "\r\n";
+    return text;
+}

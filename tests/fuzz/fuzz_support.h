@@ -1,0 +1,23 @@
+// What every fuzz target shares: a scratch folder (in memory where the system has one) and the
+// headless platform set up afresh for each input.
+#pragma once
+
+#include <cstddef>
+#include <cstdint>
+#include <string>
+#include <vector>
+
+// Program path of the scratch folder, ending in "\"; made at the first call, removed at exit.
+const std::string& ScratchFolder();
+// Resets the headless platform and the application state; the desktop is the scratch folder's
+// Desktop, which is emptied.
+void ResetForInput();
+void WriteScratchFile(const std::string& name, const std::string& bytes);
+// The file's bytes; exists tells whether it was there.
+std::string ReadScratchFile(const std::string& name, bool& exists);
+std::string ReadDesktopFile(const std::string& name, bool& exists);
+// Stops the run with a message when a property fails; libFuzzer keeps the input.
+void Require(bool holds, const char* what);
+// The lines of a catalogue as the program's reader gives them, trimmed or not.
+std::vector<std::string> CatalogueLinesOf(const std::string& bytes, bool trimmed);
+std::string CrLfText(const std::vector<std::string>& lines);
