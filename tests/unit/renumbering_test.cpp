@@ -56,7 +56,7 @@ TEST(Renumbering, NumberLines) {
     for (const char* line : {"(0)", "(12)", "  (3)  ", "(007)", " (2147483648)"})
         EXPECT_TRUE(IsNumberLine(line)) << line;
     for (const char* line : {"", "   ", "()", "(a)", "(1", "1)", "(1)x", "x(1)", "\t(1)", "(1)\t", "(1) (2)",
-                             "(-1)", "( 1)", "((1))", "// House (large)", "Mesh 3do/a(1).sim"})
+                             "(-1)", "( 1)", "((1))", "12)", "[12)", "(12]", "// House (large)", "Mesh 3do/a(1).sim"})
         EXPECT_FALSE(IsNumberLine(line)) << line;
 }
 
