@@ -67,7 +67,7 @@ void WriteBuilderList(ReportFile& list, const std::string& firstLine, const std:
             WriteReportLine(list, HeadingRuler);
             lastTitle = entry.groupTitle;
         }
-        WriteReportLine(list, "(" + std::to_string(entry.number) + ") " + entry.objectName);
+        WriteReportLine(list, NumberInParentheses(entry.number) + " " + entry.objectName);
     }
 }
 

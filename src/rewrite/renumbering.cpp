@@ -1,6 +1,7 @@
 #include "rewrite/renumbering.h"
 
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/text.h"
 #include "shell/app_state.h"
 #include "shell/messages.h"
 #include "shell/progress_list.h"
@@ -24,7 +25,7 @@ bool WriteRewrittenCatalogue(CatalogueReader& catalogue, ReportFile& temporary, 
             DrainOnePendingEvent();
             AddProgressLine(line);
         }
-        if (numbering && IsBuildingHeader(line)) WriteReportLine(temporary, "(" + std::to_string(number++) + ")");
+        if (numbering && IsBuildingHeader(line)) WriteReportLine(temporary, NumberInParentheses(number++));
         WriteReportLine(temporary, line);
     }
     return WritePendingText(temporary);
