@@ -54,7 +54,8 @@ std::vector<BuilderListEntry> ReadBuilderEntries(CatalogueReader& catalogue, boo
     return entries;
 }
 
-void WriteBuilderList(ReportFile& list, const std::string& firstLine, const std::vector<BuilderListEntry>& entries) {
+void WriteBuilderList(ReportFile& list, const std::string& firstLine,
+                      const std::vector<BuilderListEntry>& entries) {
     WriteReportLine(list, firstLine);
     WriteReportLine(list, "");
     std::string lastTitle;
@@ -84,7 +85,8 @@ CommandResult CreateMissionBuilderList(const std::string& catalogueFolder, const
     CloseCatalogue(catalogue);
 
     ReportFile list;
-    if (!CreateReport(plus ? "Static_list_FMBplus.txt" : "Static_list_FMB.txt", list)) return CommandResult::Failed;
+    if (!CreateReport(plus ? "Static_list_FMBplus.txt" : "Static_list_FMB.txt", list))
+        return CommandResult::Failed;
     WriteBuilderList(list, plus ? "Object list for fmb+" : "Object list for fmb", entries);
     return FinishReport(list) ? CommandResult::Done : CommandResult::Failed;
 }

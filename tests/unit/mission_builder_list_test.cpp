@@ -2,7 +2,6 @@
 
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
-#include "shell/progress_list.h"
 #include "test_support.h"
 
 namespace {
@@ -18,34 +17,35 @@ Strings Join(std::initializer_list<Strings> parts) {
 }
 
 // Every kind of line the lists tell apart, with LF ends to show they are read like any others.
-const std::string Catalogue = "[buildings.House$Early]\n"
-                              "  [buildings.House$Indented]  \n"
-                              "[***]\n"
-                              "  Title House \n"
-                              "(0)\n"
-                              "[buildings.House$Kiosk]\n"
-                              "Mesh 3do/Buildings/Kiosk/mono.sim\n"
-                              "[buildings.Plate$Road]\n"
-                              "[buildings.House$Barn]\n"
-                              "[buildings.House$KUST_Big]\n"
-                              "[buildings.Furniture$Suribachi_Rock]\n"
-                              "Title $kust marks nothing but is ignored\n"
-                              "[***]\n"
-                              "  Title House \n"
-                              "[buildings.House$TEMPLATES]\n"
-                              "[***]\n"
-                              "Title Field\n"
-                              "[buildings.House$Second$Name]\n"
-                              "[buildings.House]\n"
-                              "[Buildings.House$Capital]\n"
-                              "[***] more\n"
-                              "[***]\n"
-                              "[buildings.House$TitleHeader]\n"
-                              "[buildings.Mountain$Peak]\n"
-                              "[***]\n"
-                              "  Title House \n"
-                              "[buildings.House$Back]\n"
-                              "[***]";
+const std::string Catalogue =
+    "[buildings.House$Early]\n"
+    "  [buildings.House$Indented]  \n"
+    "[***]\n"
+    "  Title House \n"
+    "(0)\n"
+    "[buildings.House$Kiosk]\n"
+    "Mesh 3do/Buildings/Kiosk/mono.sim\n"
+    "[buildings.Plate$Road]\n"
+    "[buildings.House$Barn]\n"
+    "[buildings.House$KUST_Big]\n"
+    "[buildings.Furniture$Suribachi_Rock]\n"
+    "Title $kust marks nothing but is ignored\n"
+    "[***]\n"
+    "  Title House \n"
+    "[buildings.House$TEMPLATES]\n"
+    "[***]\n"
+    "Title Field\n"
+    "[buildings.House$Second$Name]\n"
+    "[buildings.House]\n"
+    "[Buildings.House$Capital]\n"
+    "[***] more\n"
+    "[***]\n"
+    "[buildings.House$TitleHeader]\n"
+    "[buildings.Mountain$Peak]\n"
+    "[***]\n"
+    "  Title House \n"
+    "[buildings.House$Back]\n"
+    "[***]";
 
 }  // namespace
 
@@ -95,8 +95,9 @@ TEST_F(MissionBuilderListTest, BothModes) {
 }
 
 TEST_F(MissionBuilderListTest, PlateNumberPassesToTheNextHeader) {
-    UseCatalogue("[buildings.Plate$A]\r\n[buildings.House$Templates]\r\n[buildings.House$Platform]\r\n"
-                 "[buildings.House$B]\r\n[buildings.Plate$C]\r\n");
+    UseCatalogue(
+        "[buildings.Plate$A]\r\n[buildings.House$Templates]\r\n[buildings.House$Platform]\r\n"
+        "[buildings.House$B]\r\n[buildings.Plate$C]\r\n");
     CreateMissionBuilderList(CatalogueFolder, "fmb");
     EXPECT_EQ(Desktop("Static_list_FMB.txt"), CrLf({"Object list for fmb", "", "(0) Platform", "(1) B"}));
     CreateMissionBuilderList(CatalogueFolder, "fmb+");
@@ -112,27 +113,11 @@ TEST_F(MissionBuilderListTest, CatalogueWithoutHeadersGivesTheFirstLinesAndOpens
 }
 
 TEST_F(MissionBuilderListTest, UnreadableCatalogueWritesNoList) {
-    ProgressListOn = true;
-    OpenProgressList();
-    AddProgressLine("left over from an earlier check");
-    for (const char* mode : {"fmb", "fmb+"}) {
+    for (const char* mode : {"fmb", "fmb+"})
         EXPECT_EQ(CreateMissionBuilderList(Folder("nowhere"), mode), CommandResult::Failed);
-    }
     EXPECT_EQ(Messages(), Strings({"static.ini failure:: Can't read the static,ini",
                                    "static.ini failure:: Can't read the static,ini"}));
     EXPECT_FALSE(Exists("Desktop/Static_list_FMB.txt"));
     EXPECT_FALSE(Exists("Desktop/Static_list_FMBplus.txt"));
-    EXPECT_TRUE(HeadlessProcesses().empty());
-    EXPECT_EQ(ProgressLines(), Strings({"left over from an earlier check"}));
-}
-
-TEST_F(MissionBuilderListTest, ListThatCannotBeWrittenIsNoSuccess) {
-    UseCatalogue("[buildings.House$A]\r\n");
-    HeadlessFileFaults faults;
-    faults.failWriteName = "Static_list_FMBplus.txt";
-    faults.failWriteAfterBytes = 5;
-    HeadlessSetFileFaults(faults);
-    EXPECT_EQ(CreateMissionBuilderList(CatalogueFolder, "fmb+"), CommandResult::Failed);
-    EXPECT_EQ(Messages(), Strings({"Report failure: Can't write Static_list_FMBplus.txt"}));
     EXPECT_TRUE(HeadlessProcesses().empty());
 }

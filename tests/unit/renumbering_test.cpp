@@ -55,20 +55,22 @@ Strings Numbered(const Strings& lines) {
 TEST(Renumbering, NumberLines) {
     for (const char* line : {"(0)", "(12)", "  (3)  ", "(007)", " (2147483648)"})
         EXPECT_TRUE(IsNumberLine(line)) << line;
-    for (const char* line : {"", "   ", "()", "(a)", "(1", "1)", "(1)x", "x(1)", "\t(1)", "(1)\t", "(1) (2)",
-                             "(-1)", "( 1)", "((1))", "12)", "[12)", "(12]", "// House (large)", "Mesh 3do/a(1).sim"})
+    for (const char* line :
+         {"", "   ", "()", "(a)", "(1", "1)", "(1)x", "x(1)", "\t(1)", "(1)\t", "(1) (2)", "(-1)", "( 1)",
+          "((1))", "12)", "[12)", "(12]", "// House (large)", "Mesh 3do/a(1).sim"})
         EXPECT_FALSE(IsNumberLine(line)) << line;
 }
 
 class RenumberCatalogueTest : public ScratchTest {
-protected:
+   protected:
     std::string Catalogue() const { return Read("mods/std/com/maddox/il2/objects/static.ini"); }
     bool TemporaryLeft() const { return Exists("mods/std/com/maddox/il2/objects/static.ini.tmp"); }
     CommandResult Run(const std::string& mode) { return RenumberCatalogue(CatalogueFolder, mode); }
 };
 
 TEST_F(RenumberCatalogueTest, RoundTripsUnderEveryLineEnd) {
-    const std::vector<Strings> endings = {{"\n"}, {"\r"}, {"\r\n"}, {"\n", "\r\n", "\r"}, {std::string(1, '\0')}};
+    const std::vector<Strings> endings = {
+        {"\n"}, {"\r"}, {"\r\n"}, {"\n", "\r\n", "\r"}, {std::string(1, '\0')}};
     for (const Strings& ends : endings) {
         SCOPED_TRACE(testing::PrintToString(ends));
         std::string original = WithEnds(UserLines, ends);
@@ -106,20 +108,22 @@ TEST_F(RenumberCatalogueTest, EmptyCatalogueStaysEmpty) {
 }
 
 TEST_F(RenumberCatalogueTest, ProgressLinesOfBothModes) {
-    const std::string catalogue = "(4)\r\n[buildings.House$A]\r\nMesh x (y)\r\n  (5)\r\n[buildings.House$B]\r\n";
+    const std::string catalogue =
+        "(4)\r\n[buildings.House$A]\r\nMesh x (y)\r\n  (5)\r\n[buildings.House$B]\r\n";
     UseCatalogue(catalogue);
     ProgressListOn = true;
     OpenProgressList();
     AddProgressLine("left over from an earlier check");
     Run("renumber");
-    EXPECT_EQ(ProgressLines(), Strings({"Remove => (4)", "[buildings.House$A]", "Mesh x (y)", "Remove =>   (5)",
-                                        "[buildings.House$B]", "Add => (0)", "[buildings.House$A]", "Mesh x (y)",
-                                        "Add => (1)", "[buildings.House$B]"}));
+    EXPECT_EQ(ProgressLines(),
+              Strings({"Remove => (4)", "[buildings.House$A]", "Mesh x (y)", "Remove =>   (5)",
+                       "[buildings.House$B]", "Add => (0)", "[buildings.House$A]", "Mesh x (y)", "Add => (1)",
+                       "[buildings.House$B]"}));
 
     UseCatalogue(catalogue);
     Run("denumber");
-    EXPECT_EQ(ProgressLines(), Strings({"Remove => (4)", "[buildings.House$A]", "Mesh x (y)", "Remove =>   (5)",
-                                        "[buildings.House$B]"}));
+    EXPECT_EQ(ProgressLines(), Strings({"Remove => (4)", "[buildings.House$A]", "Mesh x (y)",
+                                        "Remove =>   (5)", "[buildings.House$B]"}));
     EXPECT_EQ(Catalogue(), CrLf({"[buildings.House$A]", "Mesh x (y)", "[buildings.House$B]"}));
     EXPECT_EQ(Messages(), Strings({"Renumber static.ini: Done", "Denumber static.ini: Done"}));
 }
@@ -134,7 +138,8 @@ TEST_F(RenumberCatalogueTest, LetsOneEventThroughPerShownStep) {
     };
     // Three kept lines, two of them headers, one number line.
     const std::string catalogue = "(0)\r\n[buildings.House$A]\r\nMesh x\r\n[buildings.House$B]\r\n";
-    for (const Case& c : {Case{"denumber", true, 7}, Case{"renumber", true, 5}, Case{"renumber", false, 10}}) {
+    for (const Case& c :
+         {Case{"denumber", true, 7}, Case{"renumber", true, 5}, Case{"renumber", false, 10}}) {
         SCOPED_TRACE(std::string(c.mode) + (c.listOn ? " list on" : " list off"));
         UseCatalogue(catalogue);
         ProgressListOn = c.listOn;
@@ -158,12 +163,14 @@ TEST_F(RenumberCatalogueTest, FailuresLeaveTheCatalogueAsItWas) {
     laterWriteFails.failWriteAfterBytes = 100000;
     replaceFails.failReplace = true;
     const std::string cannotWrite = "static.ini failure: Can't write static.ini.tmp";
-    const std::vector<Case> cases = {{"create fails", createFails, cannotWrite},
-                                     {"first write fails", firstWriteFails, cannotWrite},
-                                     {"a later write fails", laterWriteFails, cannotWrite},
-                                     {"replace fails", replaceFails, "static.ini failure: Can't replace static.ini"}};
+    const std::vector<Case> cases = {
+        {"create fails", createFails, cannotWrite},
+        {"first write fails", firstWriteFails, cannotWrite},
+        {"a later write fails", laterWriteFails, cannotWrite},
+        {"replace fails", replaceFails, "static.ini failure: Can't replace static.ini"}};
     std::string catalogue;
-    for (int i = 0; i < 8000; ++i) catalogue += "(" + std::to_string(i) + ")\n[buildings.House$N" + std::to_string(i) + "]\n";
+    for (int i = 0; i < 8000; ++i)
+        catalogue += "(" + std::to_string(i) + ")\n[buildings.House$N" + std::to_string(i) + "]\n";
     for (const char* mode : {"renumber", "denumber"}) {
         for (const Case& c : cases) {
             SCOPED_TRACE(std::string(mode) + ": " + c.name);
