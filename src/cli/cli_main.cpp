@@ -4,11 +4,11 @@
 // be read or written.
 #include "checks/doubled_objects.h"
 #include "cli/cli_options.h"
-#include "location/catalogue_folder.h"
 #include "platform/headless/headless.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
 #include "shell/app_state.h"
+#include "shell/event_loop.h"
 #include "shell/progress_list.h"
 
 #include <cstdio>
@@ -26,8 +26,7 @@ struct CliCommand {
 // The rewrite and list commands take the folder, as the menu gives it once one is known.
 CommandResult InCatalogueFolder(CommandResult (*command)(const std::string&, const std::string&),
                                 const std::string& mode) {
-    EnsureCatalogueFolder();
-    if (CatalogueFolder.empty()) return CommandResult::NoFolder;
+    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
     return command(CatalogueFolder, mode);
 }
 
