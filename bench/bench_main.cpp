@@ -136,9 +136,13 @@ std::set<std::string> CliCommands(const std::string& cli) {
     bool listing = false;
     while (std::fgets(line, sizeof line, help)) {
         std::string text = line;
-        if (text.rfind("commands:", 0) == 0) listing = true;
-        else if (listing && text.rfind("  ", 0) == 0 && text.size() > 2 && text[2] != ' ' && text[2] != '-')
+        if (text.rfind("commands:", 0) == 0) {
+            listing = true;
+        } else if (listing && text.rfind("  ", 0) == 0 && text.size() > 2 && text[2] != ' ') {
             commands.insert(text.substr(2, text.find(' ', 2) - 2));
+        } else {
+            listing = false;
+        }
     }
     pclose(help);
     return commands;
