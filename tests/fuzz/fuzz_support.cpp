@@ -1,5 +1,6 @@
 #include "fuzz_support.h"
 
+#include "baselines.h"
 #include "catalogue/catalogue_reader.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
@@ -36,6 +37,11 @@ const std::string& ScratchFolder() {
     return folder;
 }
 
+const std::string& ScratchFolderHost() {
+    ScratchFolder();
+    return HostScratch;
+}
+
 void ResetForInput() {
     ScratchFolder();
     HeadlessReset();
@@ -62,6 +68,19 @@ std::string ReadScratchFile(const std::string& name, bool& exists) {
 }
 
 std::string ReadDesktopFile(const std::string& name, bool& exists) { return ReadScratchFile("Desktop/" + name, exists); }
+
+std::string BaselineOutput(const std::string& baseline, const std::string& report, bool& exists) {
+    ScratchFolder();
+    std::error_code error;
+    fs::remove_all(HostScratch + "/baseline", error);
+    fs::create_directories(HostScratch + "/baseline", error);
+    bool rewrite = report == "@static.ini";
+    BaselineInput input{rewrite ? HostScratch + "/copy" : HostScratch, HostScratch + "/mods", HostScratch + "/map",
+                        HostScratch + "/baseline"};
+    exists = false;
+    if (!RunBaseline(baseline, input)) return "";
+    return rewrite ? ReadScratchFile("copy/static.ini", exists) : ReadScratchFile("baseline/" + report, exists);
+}
 
 void Require(bool holds, const char* what) {
     if (holds) return;

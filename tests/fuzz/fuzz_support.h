@@ -9,6 +9,7 @@
 
 // Program path of the scratch folder, ending in "\"; made at the first call, removed at exit.
 const std::string& ScratchFolder();
+const std::string& ScratchFolderHost();
 // Resets the headless platform and the application state; the desktop is the scratch folder's
 // Desktop, which is emptied.
 void ResetForInput();
@@ -16,6 +17,9 @@ void WriteScratchFile(const std::string& name, const std::string& bytes);
 // The file's bytes; exists tells whether it was there.
 std::string ReadScratchFile(const std::string& name, bool& exists);
 std::string ReadDesktopFile(const std::string& name, bool& exists);
+// Runs a bench baseline on the scratch catalogue and gives the report it wrote (or, for
+// "@static.ini", the catalogue it rewrote, which must then be a copy in the folder "copy").
+std::string BaselineOutput(const std::string& baseline, const std::string& report, bool& exists);
 // Stops the run with a message when a property fails; libFuzzer keeps the input.
 void Require(bool holds, const char* what);
 // The lines of a catalogue as the program's reader gives them, trimmed or not.
