@@ -128,6 +128,37 @@ std::string ReadWhole(const std::string& path, bool& exists) {
     return text.str();
 }
 
+// "same", "differs" or "none" (neither file is there), read in blocks: this process must stay
+// small, since a child's peak resident size starts from its parent's size at the fork.
+std::string CompareFiles(const std::string& first, const std::string& second) {
+    std::ifstream a(first, std::ios::binary), b(second, std::ios::binary);
+    if (!a && !b) return "none";
+    if (!a || !b) return "differs";
+    std::vector<char> blockA(1 << 16), blockB(1 << 16);
+    for (;;) {
+        a.read(blockA.data(), static_cast<std::streamsize>(blockA.size()));
+        b.read(blockB.data(), static_cast<std::streamsize>(blockB.size()));
+        if (a.gcount() != b.gcount() || !std::equal(blockA.begin(), blockA.begin() + a.gcount(), blockB.begin()))
+            return "differs";
+        if (a.gcount() == 0) return "same";
+    }
+}
+
+// Writes the tree in a child process, for the same reason.
+bool WriteTreeApart(const TreeShape& shape, const std::string& folder) {
+    pid_t child = fork();
+    if (child == 0) {
+        TreeSummary summary;
+        std::string error;
+        bool written = WriteGeneratedTree(shape, folder, summary, error);
+        if (!written) std::fprintf(stderr, "verrant-bench: %s\n", error.c_str());
+        std::fflush(stderr);
+        _exit(written ? 0 : 2);
+    }
+    int status = 0;
+    return child > 0 && waitpid(child, &status, 0) == child && WIFEXITED(status) && WEXITSTATUS(status) == 0;
+}
+
 std::set<std::string> CliCommands(const std::string& cli) {
     std::set<std::string> commands;
     std::FILE* help = popen(("'" + cli + "' --help 2>&1").c_str(), "r");
@@ -242,11 +273,7 @@ int main(int argc, char** argv) {
     if (!current || marker != TreeShapeText(options.shape)) {
         std::printf("writing the tree into %s ...\n", options.tree.c_str());
         std::fflush(stdout);
-        TreeSummary summary;
-        if (!WriteGeneratedTree(options.shape, options.tree, summary, error)) {
-            std::fprintf(stderr, "verrant-bench: %s\n", error.c_str());
-            return 2;
-        }
+        if (!WriteTreeApart(options.shape, options.tree)) return 2;
     }
     Places places;
     places.modsRoot = fs::absolute(options.tree + "/mods").string();
@@ -295,21 +322,16 @@ int main(int argc, char** argv) {
                                           places.commandReports};
         for (const std::string& word : Words(row.extraWords, places)) words.push_back(word);
         Measure command = Best(options, prepare(places.commandReports), words);
-        std::string commandOutput, baselineOutput;
-        bool commandWrote = false, baselineWrote = false;
+        // A rewritten catalogue is kept aside before the baseline's runs replace it.
         std::string compared = row.compared;
-        auto output = [&](const std::string& reports, bool& wrote) {
-            return compared == "@static.ini" ? ReadWhole(places.copyFolder + "/static.ini", wrote)
-                                             : ReadWhole(reports + "/" + compared, wrote);
+        auto output = [&](const std::string& reports) {
+            return compared == "@static.ini" ? reports + "/static.ini" : reports + "/" + compared;
         };
-        if (!compared.empty()) commandOutput = output(places.commandReports, commandWrote);
+        if (compared == "@static.ini") fs::copy_file(places.copyFolder + "/static.ini", output(places.commandReports));
         Measure baseline = Best(options, prepare(places.baselineReports), baselineWords(row.baseline, folder));
-        if (!compared.empty()) baselineOutput = output(places.baselineReports, baselineWrote);
-
-        std::string verdict = compared.empty()                ? ""
-                              : !commandWrote && !baselineWrote ? "none"
-                              : commandWrote && baselineWrote && commandOutput == baselineOutput ? "same"
-                                                                                                 : "differs";
+        if (compared == "@static.ini") fs::copy_file(places.copyFolder + "/static.ini", output(places.baselineReports));
+        std::string verdict =
+            compared.empty() ? "" : CompareFiles(output(places.commandReports), output(places.baselineReports));
         if (command.status < 0 || command.status > 1) verdict = "exit " + std::to_string(command.status);
         if (baseline.status != 0) verdict += " (baseline failed)";
         PrintRow({row.command, Seconds(command), row.baseline, Seconds(baseline),
