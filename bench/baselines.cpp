@@ -1,5 +1,8 @@
 #include "baselines.h"
 
+#include "catalogue/catalogue_reader.h"
+#include "catalogue/text.h"
+
 #include <cstdio>
 #include <cstring>
 #include <dirent.h>
@@ -30,32 +33,13 @@ bool ReadPhysicalLine(std::FILE* file, std::string& line) {
     return true;
 }
 
-std::string Trim(const std::string& line) {
-    std::size_t first = line.find_first_not_of(' ');
-    if (first == std::string::npos) return "";
-    return line.substr(first, line.find_last_not_of(' ') - first + 1);
-}
-
 bool ReadCatalogueLine(std::FILE* file, std::string& line) {
     if (!ReadPhysicalLine(file, line)) return false;
-    line = Trim(line);
+    TrimBlanksInPlace(line);
     return true;
 }
 
 bool Begins(const std::string& line, const char* prefix) { return line.compare(0, std::strlen(prefix), prefix) == 0; }
-
-std::string Lower(std::string text) {
-    for (char& c : text)
-        if (c >= 'A' && c <= 'Z') c = static_cast<char>(c - 'A' + 'a');
-    return text;
-}
-
-std::string BracketCut(const std::string& header) {
-    std::size_t bracket = header.find(']', 1);
-    return header.substr(1, bracket == std::string::npos ? std::string::npos : bracket - 1);
-}
-
-std::string EndCut(const std::string& header) { return header.size() < 2 ? "" : header.substr(1, header.size() - 2); }
 
 //--- writing
 
@@ -70,6 +54,19 @@ struct Report {
 bool OpenReport(const BaselineInput& input, const char* name, Report& report) {
     report.file = std::fopen((input.reportFolder + "/" + name).c_str(), "wb");
     return report.file != nullptr;
+}
+
+// A heading, an empty line and the findings; no report at all without findings.
+bool WriteFindings(const BaselineInput& input, const char* name, const char* heading,
+                   const std::vector<std::string>& findings) {
+    if (findings.empty()) return true;
+    Report report;
+    if (!OpenReport(input, name, report)) return false;
+    report.Line(heading);
+    report.Line("");
+    for (const std::string& line : findings) report.Line(line);
+    std::fclose(report.file);
+    return true;
 }
 
 //--- the catalogue checks
@@ -100,7 +97,7 @@ std::vector<std::string> SectionNamesByBracket(std::FILE* file) {
     std::vector<std::string> names;
     std::string line;
     while (ReadCatalogueLine(file, line))
-        if (Begins(line, "[bui")) names.push_back(BracketCut(line));
+        if (Begins(line, "[bui")) names.push_back(SectionNameByBracket(line));
     return names;
 }
 
@@ -116,14 +113,7 @@ bool PairwiseDoubles(const BaselineInput& input) {
                 found.push_back("Double object (" + std::to_string(i) + ") => (" + std::to_string(k) + "): " + names[i]);
                 break;
             }
-    if (found.empty()) return true;
-    Report report;
-    if (!OpenReport(input, "Doubled_objects.txt", report)) return false;
-    report.Line("Doubled objects in your static.ini:");
-    report.Line("");
-    for (const std::string& line : found) report.Line(line);
-    std::fclose(report.file);
-    return true;
+    return WriteFindings(input, "Doubled_objects.txt", "Doubled objects in your static.ini:", found);
 }
 
 const char* const RegularLinePrefixes[] = {
@@ -150,14 +140,7 @@ bool PrefixTable(const BaselineInput& input) {
             found.push_back("Irregular entry towards object " + std::to_string(entry) + ": " + line);
     }
     std::fclose(file);
-    if (found.empty()) return true;
-    Report report;
-    if (!OpenReport(input, "Irregular_entrys.txt", report)) return false;
-    report.Line("Irregular entrys in your static.ini:");
-    report.Line("");
-    for (const std::string& text : found) report.Line(text);
-    std::fclose(report.file);
-    return true;
+    return WriteFindings(input, "Irregular_entrys.txt", "Irregular entrys in your static.ini:", found);
 }
 
 bool BareKeys(const BaselineInput& input) {
@@ -173,7 +156,7 @@ bool BareKeys(const BaselineInput& input) {
     while (ReadCatalogueLine(file, line)) {
         if (Begins(line, "[bui")) {
             ++ordinal;
-            section = EndCut(line);
+            section = SectionNameByEnds(line);
         } else if (line == "Mesh" || line == "MeshLive" || line == "MeshDead") {
             if (line == "Mesh") report.Line("**************");
             report.Line("Object " + std::to_string(ordinal));
@@ -210,7 +193,7 @@ const char* const StandardTitles[] = {
     "Title Slovakia Obstacles", "Title Rumania", "Title Humans"};
 
 void SetMeshValue(const std::string& line, std::string& field) {
-    std::size_t at = Lower(line).find("3do");
+    std::size_t at = LowerCopy(line).find("3do");
     if (at == std::string::npos) return;
     field = line.substr(at);
     for (char& c : field)
@@ -239,7 +222,7 @@ bool BuildMeshIndex(const BaselineInput& input, std::vector<MeshIndexEntry>& ind
             ++last;
             MeshIndexEntry& entry = index[static_cast<std::size_t>(last)];
             entry.title = title;
-            entry.sectionName = EndCut(line);
+            entry.sectionName = SectionNameByEnds(line);
             entry.number = static_cast<int>(last);
         } else if (last >= 0 && Begins(line, "Mesh ")) {
             SetMeshValue(line, index[static_cast<std::size_t>(last)].mesh);
@@ -316,7 +299,7 @@ bool OpenPerMeshPerFolder(const BaselineInput& input) {
         if (!IsFolder(modFolder)) continue;
         DIR* mod = opendir(modFolder.c_str());
         while (dirent* inner = mod ? readdir(mod) : nullptr) {
-            if (Lower(inner->d_name) != "3do" || !IsFolder(modFolder + "/" + inner->d_name)) continue;
+            if (LowerCopy(inner->d_name) != "3do" || !IsFolder(modFolder + "/" + inner->d_name)) continue;
             for (long long i = 0; i <= last; ++i) {
                 MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
                 if (entry.title.empty()) continue;
@@ -395,14 +378,7 @@ bool LinearNameWalk(const BaselineInput& input) {
         for (std::size_t k = 0; k < names.size() && !found; ++k) found = names[k] == name;
         if (!found) missing.push_back(name);
     }
-    if (missing.empty()) return true;
-    Report report;
-    if (!OpenReport(input, "Missing_objects.txt", report)) return false;
-    report.Line("Missing objects in your static.ini:");
-    report.Line("");
-    for (const std::string& name : missing) report.Line(name);
-    std::fclose(report.file);
-    return true;
+    return WriteFindings(input, "Missing_objects.txt", "Missing objects in your static.ini:", missing);
 }
 
 //--- rewriting: stream the catalogue through static.ini.tmp, once or twice
@@ -443,15 +419,6 @@ bool RenumberPasses(const BaselineInput& input) {
 
 //--- the mission-builder lists
 
-std::string ObjectName(const std::string& header) {
-    std::size_t dollar = header.find('$');
-    std::size_t start = dollar == std::string::npos ? 0 : dollar + 1;
-    std::size_t next = header.find('$', start);
-    std::string name = header.substr(start, next == std::string::npos ? std::string::npos : next - start);
-    if (!name.empty()) name.pop_back();
-    return name;
-}
-
 bool BuilderList(const BaselineInput& input, bool plus) {
     struct Entry {
         std::string groupTitle;
@@ -465,12 +432,12 @@ bool BuilderList(const BaselineInput& input, bool plus) {
     std::string title, line;
     int counter = -1;
     while (ReadCatalogueLine(file, line)) {
-        std::string lower = Lower(line);
+        std::string lower = LowerCopy(line);
         if (lower.find("$kust") != std::string::npos || lower.find("$suribachi") != std::string::npos) continue;
         if (line == "[***]") {
             if (!ReadPhysicalLine(file, title)) title.clear();
         } else if (Begins(line, "[bui")) {
-            entries.push_back({title, ++counter, false, ObjectName(line)});
+            entries.push_back({title, ++counter, false, ObjectNameOf(line)});
             if (!plus && lower.find("plate") != std::string::npos) {
                 entries.back().isPlate = true;
                 --counter;

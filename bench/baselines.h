@@ -1,6 +1,6 @@
 // Straightforward versions of each command, written the way the command's own description reads
 // (pairwise walks, linear lookups, one open per mesh per folder), to measure the real commands
-// against. They share nothing with the program's code.
+// against. Of the program's code they use only the name cuts and text helpers.
 #pragma once
 
 #include <string>
