@@ -33,8 +33,11 @@ std::vector<BuilderListEntry> ReadBuilderEntries(CatalogueReader& catalogue, boo
     int counter = -1;
     std::string line;
     while (NextCatalogueLine(catalogue, line)) {
-        std::string lower = LowerCopy(line);
-        if (Contains(lower, "$kust") || Contains(lower, "$suribachi")) continue;
+        // Only a line with a "$" can hold "$kust" or "$suribachi", and only a header is tested for
+        // "plate": the other lines, most of a big catalogue, need no lowered copy.
+        bool dollar = line.find('$') != std::string::npos;
+        std::string lower = dollar || IsBuildingHeader(line) ? LowerCopy(line) : std::string();
+        if (dollar && (Contains(lower, "$kust") || Contains(lower, "$suribachi"))) continue;
         if (line == "[***]") {
             // The title line is taken whole and not judged, even when it is a header itself.
             NextPhysicalLine(catalogue, groupTitle);
