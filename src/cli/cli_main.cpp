@@ -2,13 +2,15 @@
 // byte for byte as the desktop program writes them; exit status 0 nothing found, 1 findings,
 // 2 bad usage or a catalogue or report that could not be read or written.
 #include "checks/doubled_objects.h"
+#include "checks/empty_references.h"
+#include "checks/irregular_entries.h"
 #include "cli/cli_options.h"
+#include "location/catalogue_folder.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
 #include "shell/progress_list.h"
 
 #include <cstdio>
-#include <filesystem>
 #include <functional>
 
 namespace {
@@ -22,6 +24,13 @@ struct CliCommand {
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"irregular-entries", "lines that begin with none of the known prefixes",
+     [](const CliOptions&) { return CheckIrregularEntries(); }},
+    {"empty-references", "Mesh, MeshLive and MeshDead lines without a value",
+     [](const CliOptions&) {
+         EnsureCatalogueFolder();
+         return CatalogueFolder.empty() ? CommandResult::NoFolder : FindEmptyReferences(CatalogueFolder);
+     }},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
@@ -70,8 +79,8 @@ int main(int argc, char** argv) {
     StartFolder = ProgramFolder(".");
     if (!options.catalogue.empty()) CatalogueFolder = ProgramFolder(options.catalogue);
     std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
-    std::error_code fsError;
-    if (!std::filesystem::is_directory(reportDir, fsError)) {
+    // Through the file layer, so that the folder's name matches as the catalogue's does.
+    if (!MakeFolderCurrent(ProgramFolder(reportDir))) {
         std::fprintf(stderr, "verrant-cli: report folder %s does not exist\n", reportDir.c_str());
         return ExitTrouble;
     }
