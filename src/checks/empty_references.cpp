@@ -1,6 +1,6 @@
 #include "checks/empty_references.h"
 
-#include "catalogue/catalogue_reader.h"
+#include "checks/catalogue_opening.h"
 #include "shell/app_state.h"
 #include "shell/messages.h"
 #include "shell/progress_list.h"
@@ -25,10 +25,7 @@ std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
 
 CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
     CatalogueReader reader;
-    if (!OpenCatalogue(catalogueFolder, reader)) {
-        ShowMessage("static.ini failure", "Can't open static.ini");
-        return CommandResult::Failed;
-    }
+    if (!OpenCatalogueForCheck(catalogueFolder, reader)) return CommandResult::Failed;
     if (ProgressListOn) {
         ClearProgressList();
         AddProgressLine("Empty references in your Static.ini");

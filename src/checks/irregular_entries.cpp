@@ -1,6 +1,6 @@
 #include "checks/irregular_entries.h"
 
-#include "catalogue/catalogue_reader.h"
+#include "checks/catalogue_opening.h"
 #include "catalogue/text.h"
 #include "location/catalogue_folder.h"
 #include "shell/app_state.h"
@@ -59,13 +59,10 @@ CommandResult CheckIrregularEntries() {
     EnsureCatalogueFolder();
     if (CatalogueFolder.empty()) return CommandResult::NoFolder;
     CatalogueReader reader;
-    if (!OpenCatalogue(CatalogueFolder, reader)) {
-        ShowMessage("static.ini failure", "Can't open static.ini");
-        return CommandResult::Failed;
-    }
+    if (!OpenCatalogueForCheck(CatalogueFolder, reader)) return CommandResult::Failed;
     if (ProgressListOn) ClearProgressList();
 
-    std::vector<IrregularEntry> irregulars;
+    std::vector<std::string> irregulars;  // their report lines
     int entryNumber = 0, regularCount = 0;
     std::string line;
     while (NextCatalogueLine(reader, line)) {
@@ -77,7 +74,7 @@ CommandResult CheckIrregularEntries() {
                 AddProgressLine("Reg: " + std::string(prefix) + " => " + line);
             }
         } else if (!line.empty()) {
-            irregulars.push_back({entryNumber, line});
+            irregulars.push_back(IrregularEntryLine({entryNumber, line}));
             if (ProgressListOn) {
                 DrainPendingEvents();
                 AddProgressLine(Ruler41);
@@ -97,10 +94,5 @@ CommandResult CheckIrregularEntries() {
         ShowMessage("No irregular objects", "No irregular objects found in your static.ini");
         return CommandResult::NothingFound;
     }
-    ReportFile report;
-    if (!CreateReport("Irregular_entrys.txt", report)) return CommandResult::Failed;
-    WriteReportLine(report, "Irregular entrys in your static.ini:");
-    WriteReportLine(report, "");
-    for (const IrregularEntry& entry : irregulars) WriteReportLine(report, IrregularEntryLine(entry));
-    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+    return WriteFindingsReport("Irregular_entrys.txt", "Irregular entrys in your static.ini:", irregulars);
 }

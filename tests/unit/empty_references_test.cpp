@@ -2,7 +2,6 @@
 
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
-#include "shell/progress_list.h"
 #include "test_support.h"
 
 namespace {
@@ -48,18 +47,7 @@ const std::string MixedReport = CrLf({"Empty references in your static.ini",
 const std::string NothingFoundReport = "Empty references in your static.ini\r\n\r\n"
                                        "No empty references found in your static.ini";
 
-class FindEmptyReferencesTest : public ScratchTest {
-protected:
-    void Restart() {
-        TearDown();
-        SetUp();
-    }
-    void ListOn() {
-        ProgressListOn = true;
-        OpenProgressList();
-        AddProgressLine("left over from an earlier check");
-    }
-};
+class FindEmptyReferencesTest : public ScratchTest {};
 
 }  // namespace
 
@@ -74,7 +62,7 @@ TEST(EmptyReferences, OnlyTheBareKeyIsEmpty) {
 
 TEST_F(FindEmptyReferencesTest, ReportAndProgressLines) {
     UseCatalogue(MixedCatalogue);
-    ListOn();
+    SwitchListOn();
     EXPECT_EQ(FindEmptyReferences(CatalogueFolder), CommandResult::Findings);
     EXPECT_EQ(Desktop("Empty_references.txt"), MixedReport);
     EXPECT_EQ(ProgressLines(), Strings({"Empty references in your Static.ini",
@@ -118,7 +106,7 @@ TEST_F(FindEmptyReferencesTest, NothingFoundIsStillReportedAndOpened) {
         Restart();
         UseCatalogue("[buildings.House$A]\r\nMesh 3do/a.sim\r\nMeshLive\t\r\n");
         Write("Desktop/Empty_references.txt", "an older report, longer than the new one will be ........");
-        if (listOn) ListOn();
+        if (listOn) SwitchListOn();
         EXPECT_EQ(FindEmptyReferences(CatalogueFolder), CommandResult::NothingFound);
         EXPECT_EQ(Desktop("Empty_references.txt"), NothingFoundReport);
         EXPECT_EQ(HeadlessProcesses().size(), 1u);
@@ -131,7 +119,7 @@ TEST_F(FindEmptyReferencesTest, NothingFoundIsStillReportedAndOpened) {
 }
 
 TEST_F(FindEmptyReferencesTest, UnreadableCatalogueTellsAndTouchesNothing) {
-    ListOn();
+    SwitchListOn();
     EXPECT_EQ(FindEmptyReferences(Folder("missing")), CommandResult::Failed);
     EXPECT_EQ(Messages(), Strings({"static.ini failure: Can't open static.ini"}));
     EXPECT_EQ(ProgressLines(), Strings({"left over from an earlier check"}));
@@ -168,7 +156,7 @@ TEST_F(FindEmptyReferencesTest, DrainsEventsAtFindingsWhileTheListIsOn) {
         SCOPED_TRACE(c.catalogue + (c.listOn ? " list on" : " list off"));
         Restart();
         UseCatalogue(c.catalogue);
-        if (c.listOn) ListOn();
+        if (c.listOn) SwitchListOn();
         HeadlessPushPending(OtherStep("anything"));
         FindEmptyReferences(CatalogueFolder);
         Event event;

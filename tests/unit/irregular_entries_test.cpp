@@ -2,7 +2,6 @@
 
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
-#include "shell/progress_list.h"
 #include "test_support.h"
 
 namespace {
@@ -84,23 +83,11 @@ TEST(IrregularEntries, EntryNumberCountsFiveCharacterHeaders) {
     EXPECT_FALSE(RaisesEntryNumber("\t[buildings.House$A]"));
 }
 
-class CheckIrregularEntriesTest : public ScratchTest {
-protected:
-    // A fresh scratch folder and platform, for cases run in a loop.
-    void Restart() {
-        TearDown();
-        SetUp();
-    }
-    void ListOn() {
-        ProgressListOn = true;
-        OpenProgressList();
-        AddProgressLine("left over from an earlier check");
-    }
-};
+class CheckIrregularEntriesTest : public ScratchTest {};
 
 TEST_F(CheckIrregularEntriesTest, ReportAndProgressLines) {
     UseCatalogue(CrLf(MixedCatalogue));
-    ListOn();
+    SwitchListOn();
     EXPECT_EQ(CheckIrregularEntries(), CommandResult::Findings);
     EXPECT_EQ(Desktop("Irregular_entrys.txt"), MixedReport);
     const std::string ruler(41, '*');
@@ -145,7 +132,7 @@ TEST_F(CheckIrregularEntriesTest, NothingIrregularShowsMessageAndWritesNoReport)
         SCOPED_TRACE(listOn ? "list on" : "list off");
         Restart();
         UseCatalogue("   \r\n[buildings.House$A]\r\n\r\nMesh 3do/a.sim\r\n");
-        if (listOn) ListOn();
+        if (listOn) SwitchListOn();
         EXPECT_EQ(CheckIrregularEntries(), CommandResult::NothingFound);
         EXPECT_EQ(Messages(), Strings({"No irregular objects: No irregular objects found in your static.ini"}));
         EXPECT_FALSE(Exists("Desktop/Irregular_entrys.txt"));
@@ -160,7 +147,7 @@ TEST_F(CheckIrregularEntriesTest, NothingIrregularShowsMessageAndWritesNoReport)
 
 TEST_F(CheckIrregularEntriesTest, UnreadableCatalogueTellsAndTouchesNothing) {
     CatalogueFolder = Folder("missing");
-    ListOn();
+    SwitchListOn();
     EXPECT_EQ(CheckIrregularEntries(), CommandResult::Failed);
     EXPECT_EQ(Messages(), Strings({"static.ini failure: Can't open static.ini"}));
     EXPECT_EQ(ProgressLines(), Strings({"left over from an earlier check"}));
@@ -185,7 +172,7 @@ TEST_F(CheckIrregularEntriesTest, DrainsEventsOnlyWhileTheListIsOn) {
         SCOPED_TRACE(listOn ? "list on" : "list off");
         Restart();
         UseCatalogue("Colour red\r\n");
-        if (listOn) ListOn();
+        if (listOn) SwitchListOn();
         HeadlessPushPending(OtherStep("anything"));
         CheckIrregularEntries();
         Event event;
