@@ -5,9 +5,9 @@
 #include "checks/empty_references.h"
 #include "checks/irregular_entries.h"
 #include "cli/cli_options.h"
-#include "location/catalogue_folder.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
+#include "shell/event_loop.h"
 #include "shell/progress_list.h"
 
 #include <cstdio>
@@ -28,8 +28,7 @@ const CliCommand Commands[] = {
      [](const CliOptions&) { return CheckIrregularEntries(); }},
     {"empty-references", "Mesh, MeshLive and MeshDead lines without a value",
      [](const CliOptions&) {
-         EnsureCatalogueFolder();
-         return CatalogueFolder.empty() ? CommandResult::NoFolder : FindEmptyReferences(CatalogueFolder);
+         return EnsureCatalogueFolderKnown() ? FindEmptyReferences(CatalogueFolder) : CommandResult::NoFolder;
      }},
 };
 
