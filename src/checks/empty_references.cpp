@@ -58,7 +58,8 @@ CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
         }
         // Only a "Mesh" finding opens with the ruler in the report; the other two run on from the
         // finding before them.
-        for (std::size_t i = reference.key == "Mesh" ? 0 : 1; i < lines.size(); ++i) WriteReportLine(report, lines[i]);
+        for (std::size_t i = reference.key == "Mesh" ? 0 : 1; i < lines.size(); ++i)
+            WriteReportLine(report, lines[i]);
     }
     if (!found) {
         if (ProgressListOn) AddProgressLine(NothingFoundLine);

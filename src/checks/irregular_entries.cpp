@@ -78,7 +78,8 @@ CommandResult CheckIrregularEntries() {
             if (ProgressListOn) {
                 DrainPendingEvents();
                 AddProgressLine(Ruler41);
-                AddProgressLine("Irregular entry towards object (" + std::to_string(entryNumber) + "): " + line);
+                AddProgressLine("Irregular entry towards object (" + std::to_string(entryNumber) +
+                                "): " + line);
                 AddProgressLine(Ruler41);
             }
         }

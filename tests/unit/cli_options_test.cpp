@@ -5,8 +5,8 @@
 TEST(CliOptions, TakesCommandAndOptionsInAnyOrder) {
     CliOptions options;
     std::string error;
-    ASSERT_TRUE(ParseCliOptions({"--progress", "--report-dir", "out", "empty-references", "--catalogue", "a b"},
-                                options, error));
+    ASSERT_TRUE(ParseCliOptions(
+        {"--progress", "--report-dir", "out", "empty-references", "--catalogue", "a b"}, options, error));
     EXPECT_EQ(options.command, "empty-references");
     EXPECT_EQ(options.catalogue, "a b");
     EXPECT_EQ(options.reportDir, "out");

@@ -20,7 +20,7 @@ const std::string Clean = "[buildings.House$A]\r\nMesh 3do/a.sim\r\n";
 const std::string Faulty = "Colour red\r\n[buildings.House$A]\r\nMeshLive\r\n";
 
 class CliTest : public ScratchTest {
-protected:
+   protected:
     // Runs verrant-cli in the scratch folder's "run" folder with the words, each quoted.
     CliRun Run(const Strings& words) {
         std::filesystem::create_directories(Host("run"));
@@ -52,11 +52,13 @@ TEST_F(CliTest, ExitStatusReportAndMessagePerCommand) {
         std::string reportName, report, err;
     } cases[] = {
         {"doubled-objects", Doubles, 1, "Doubled_objects.txt",
-         CrLf({"Doubled objects in your static.ini:", "", "Double object (0) => (2): buildings.House$A"}), ""},
+         CrLf({"Doubled objects in your static.ini:", "", "Double object (0) => (2): buildings.House$A"}),
+         ""},
         {"doubled-objects", Clean, 0, "Doubled_objects.txt", "",
          "No doubled objects: No doubled objects found in your static.ini\n"},
         {"irregular-entries", Faulty, 1, "Irregular_entrys.txt",
-         CrLf({"Irregular entrys in your static.ini:", "", "Irregular entry towards object 0: Colour red"}), ""},
+         CrLf({"Irregular entrys in your static.ini:", "", "Irregular entry towards object 0: Colour red"}),
+         ""},
         {"irregular-entries", Clean, 0, "Irregular_entrys.txt", "",
          "No irregular objects: No irregular objects found in your static.ini\n"},
         {"empty-references", Faulty, 1, "Empty_references.txt",
@@ -81,8 +83,9 @@ TEST_F(CliTest, ExitStatusReportAndMessagePerCommand) {
 TEST_F(CliTest, ProgressLinesGoToStandardOutput) {
     CliRun run = RunCheck("empty-references", Faulty, {"--progress"});
     EXPECT_EQ(run.status, 1);
-    EXPECT_EQ(run.out, "Empty references in your Static.ini\n \n**************\nObject 0\nbuildings.House$A\n"
-                       "Empty reference: MeshLive\n");
+    EXPECT_EQ(run.out,
+              "Empty references in your Static.ini\n \n**************\nObject 0\nbuildings.House$A\n"
+              "Empty reference: MeshLive\n");
     run = RunCheck("doubled-objects", Clean, {"--progress"});
     EXPECT_EQ(run.status, 0);
     EXPECT_EQ(run.out, "Build (0) buildings.House$A\n\nTotal number of objects: 1\n");
@@ -94,7 +97,8 @@ TEST_F(CliTest, CatalogueThatCannotBeReadExitsTwoAndWritesNothing) {
     std::filesystem::create_directories(Host("empty"));
     for (const char* command : {"doubled-objects", "irregular-entries", "empty-references"}) {
         SCOPED_TRACE(command);
-        CliRun run = Run({command, "--catalogue", Host("empty"), "--report-dir", Host("reports"), "--progress"});
+        CliRun run =
+            Run({command, "--catalogue", Host("empty"), "--report-dir", Host("reports"), "--progress"});
         EXPECT_EQ(run.status, 2);
         EXPECT_EQ(run.out, "");
         EXPECT_EQ(run.err, "static.ini failure: Can't open static.ini\n");
@@ -125,7 +129,9 @@ TEST_F(CliTest, HelpAndBadUsage) {
         EXPECT_NE(run.out.find(std::string("\n  ") + command + " "), std::string::npos) << command;
     EXPECT_EQ(run.err, "");
 
-    const Strings badUsages[] = {{}, {"doubled-objects", "--catalogue"}, {"no-such-check", "--catalogue", "."},
+    const Strings badUsages[] = {{},
+                                 {"doubled-objects", "--catalogue"},
+                                 {"no-such-check", "--catalogue", "."},
                                  {"doubled-objects", "--colour"}};
     for (const Strings& words : badUsages) {
         run = Run(words);
@@ -139,11 +145,12 @@ TEST_F(CliTest, HelpAndBadUsage) {
 TEST_F(CliTest, NamesMatchWithoutRegardToCase) {
     Write("Mods/STD/Objects/Static.ini", Faulty);
     std::filesystem::create_directories(Host("Reports"));
-    CliRun run = Run({"irregular-entries", "--catalogue", Host("mods/std/objects"), "--report-dir", Host("reports")});
+    CliRun run =
+        Run({"irregular-entries", "--catalogue", Host("mods/std/objects"), "--report-dir", Host("reports")});
     EXPECT_EQ(run.status, 1);
     EXPECT_EQ(run.err, "");
-    EXPECT_EQ(Read("Reports/Irregular_entrys.txt"),
-              CrLf({"Irregular entrys in your static.ini:", "", "Irregular entry towards object 0: Colour red"}));
+    EXPECT_EQ(Read("Reports/Irregular_entrys.txt"), CrLf({"Irregular entrys in your static.ini:", "",
+                                                          "Irregular entry towards object 0: Colour red"}));
 }
 
 TEST_F(CliTest, ReportGoesToTheCurrentFolderByDefault) {

@@ -8,18 +8,19 @@ namespace {
 
 // A bare key before the first header, a header with text after its "]", keys with blanks, with a
 // tab, with a value and in lower case, and a "[Buildings" line that is no header.
-const std::string MixedCatalogue = "Mesh\r\n"
-                                   "[buildings.House$A] // moved\r\n"
-                                   "Mesh   \r\n"
-                                   "  MeshLive\r\n"
-                                   "Mesh\t\r\n"
-                                   "MeshDead 3do/a.sim\r\n"
-                                   "mesh\r\n"
-                                   "Mesh=\r\n"
-                                   "[buildings.House$B]\n"
-                                   "MeshDead\n"
-                                   "[Buildings.House$C]\n"
-                                   "Mesh";
+const std::string MixedCatalogue =
+    "Mesh\r\n"
+    "[buildings.House$A] // moved\r\n"
+    "Mesh   \r\n"
+    "  MeshLive\r\n"
+    "Mesh\t\r\n"
+    "MeshDead 3do/a.sim\r\n"
+    "mesh\r\n"
+    "Mesh=\r\n"
+    "[buildings.House$B]\n"
+    "MeshDead\n"
+    "[Buildings.House$C]\n"
+    "Mesh";
 
 const std::string Ruler14(14, '*');
 
@@ -44,8 +45,9 @@ const std::string MixedReport = CrLf({"Empty references in your static.ini",
                                       "buildings.House$B",
                                       "Empty reference: Mesh"});
 
-const std::string NothingFoundReport = "Empty references in your static.ini\r\n\r\n"
-                                       "No empty references found in your static.ini";
+const std::string NothingFoundReport =
+    "Empty references in your static.ini\r\n\r\n"
+    "No empty references found in your static.ini";
 
 class FindEmptyReferencesTest : public ScratchTest {};
 
@@ -53,9 +55,18 @@ class FindEmptyReferencesTest : public ScratchTest {};
 
 TEST(EmptyReferences, OnlyTheBareKeyIsEmpty) {
     const std::pair<std::string, std::string> cases[] = {
-        {"Mesh", "Mesh"},         {"MeshLive", "MeshLive"}, {"MeshDead", "MeshDead"}, {"Mesh\t", ""},
-        {"Mesh=", ""},            {"Mesh 3do/x.sim", ""},   {"mesh", ""},             {"MESHLIVE", ""},
-        {"MeshLiveX", ""},        {"Mes", ""},              {"", ""},                 {"\tMeshDead", ""},
+        {"Mesh", "Mesh"},
+        {"MeshLive", "MeshLive"},
+        {"MeshDead", "MeshDead"},
+        {"Mesh\t", ""},
+        {"Mesh=", ""},
+        {"Mesh 3do/x.sim", ""},
+        {"mesh", ""},
+        {"MESHLIVE", ""},
+        {"MeshLiveX", ""},
+        {"Mes", ""},
+        {"", ""},
+        {"\tMeshDead", ""},
     };
     for (const auto& [line, key] : cases) EXPECT_EQ(EmptyReferenceKey(line), key) << line;
 }

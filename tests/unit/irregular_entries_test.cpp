@@ -8,20 +8,19 @@ namespace {
 
 // Irregular lines before the first entry, blank lines, a header of another family that opens an
 // entry and one ("[bui" alone) that does not.
-const Strings MixedCatalogue = {
-    "Wobble 0",
-    "   ",
-    "// comment",
-    "[buildings.House$A]",
-    "Title A",
-    "MeshLive 3do/a.sim",
-    "Colour red",
-    "[buildings.Tree$B]",
-    "\tMesh 3do/b.sim",
-    "[buiX]",
-    "[***] Trees",
-    "[***]",
-};
+const std::string MixedCatalogue =
+    "Wobble 0\r\n"
+    "   \r\n"
+    "// comment\r\n"
+    "[buildings.House$A]\r\n"
+    "Title A\r\n"
+    "MeshLive 3do/a.sim\r\n"
+    "Colour red\r\n"
+    "[buildings.Tree$B]\r\n"
+    "\tMesh 3do/b.sim\r\n"
+    "[buiX]\r\n"
+    "[***] Trees\r\n"
+    "[***]\r\n";
 
 const std::string MixedReport = CrLf({
     "Irregular entrys in your static.ini:",
@@ -86,7 +85,7 @@ TEST(IrregularEntries, EntryNumberCountsFiveCharacterHeaders) {
 class CheckIrregularEntriesTest : public ScratchTest {};
 
 TEST_F(CheckIrregularEntriesTest, ReportAndProgressLines) {
-    UseCatalogue(CrLf(MixedCatalogue));
+    UseCatalogue(MixedCatalogue);
     SwitchListOn();
     EXPECT_EQ(CheckIrregularEntries(), CommandResult::Findings);
     EXPECT_EQ(Desktop("Irregular_entrys.txt"), MixedReport);
@@ -121,7 +120,7 @@ TEST_F(CheckIrregularEntriesTest, ReportAndProgressLines) {
 }
 
 TEST_F(CheckIrregularEntriesTest, ListOffGivesTheSameReportAndNoLines) {
-    UseCatalogue(CrLf(MixedCatalogue));
+    UseCatalogue(MixedCatalogue);
     EXPECT_EQ(CheckIrregularEntries(), CommandResult::Findings);
     EXPECT_EQ(Desktop("Irregular_entrys.txt"), MixedReport);
     EXPECT_EQ(ProgressWindow, 0u);
@@ -134,13 +133,14 @@ TEST_F(CheckIrregularEntriesTest, NothingIrregularShowsMessageAndWritesNoReport)
         UseCatalogue("   \r\n[buildings.House$A]\r\n\r\nMesh 3do/a.sim\r\n");
         if (listOn) SwitchListOn();
         EXPECT_EQ(CheckIrregularEntries(), CommandResult::NothingFound);
-        EXPECT_EQ(Messages(), Strings({"No irregular objects: No irregular objects found in your static.ini"}));
+        EXPECT_EQ(Messages(),
+                  Strings({"No irregular objects: No irregular objects found in your static.ini"}));
         EXPECT_FALSE(Exists("Desktop/Irregular_entrys.txt"));
         EXPECT_TRUE(HeadlessProcesses().empty());
         if (listOn) {
-            EXPECT_EQ(ProgressLines(), Strings({"Reg: [buildings.House$ => [buildings.House$A]",
-                                                "Reg: Mesh => Mesh 3do/a.sim", " ", "Regular lines: 2",
-                                                "Irregular lines: 0"}));
+            EXPECT_EQ(ProgressLines(),
+                      Strings({"Reg: [buildings.House$ => [buildings.House$A]", "Reg: Mesh => Mesh 3do/a.sim",
+                               " ", "Regular lines: 2", "Irregular lines: 0"}));
         }
     }
 }
@@ -156,7 +156,7 @@ TEST_F(CheckIrregularEntriesTest, UnreadableCatalogueTellsAndTouchesNothing) {
 }
 
 TEST_F(CheckIrregularEntriesTest, ReportThatCannotBeWrittenIsNoSuccess) {
-    UseCatalogue(CrLf(MixedCatalogue));
+    UseCatalogue(MixedCatalogue);
     HeadlessFileFaults faults;
     faults.failWriteName = "Irregular_entrys.txt";
     faults.failWriteAfterBytes = 40;
