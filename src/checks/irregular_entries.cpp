@@ -48,9 +48,6 @@ std::string_view RegularLinePrefixOf(const std::string& line) {
     return {};
 }
 
-// Five characters, one more than a building header needs: "[buil" and not "[bui".
-bool RaisesEntryNumber(const std::string& line) { return StartsWith(line, "[buil"); }
-
 std::string IrregularEntryLine(const IrregularEntry& entry) {
     return "Irregular entry towards object " + std::to_string(entry.objectNumber) + ": " + entry.line;
 }
@@ -66,7 +63,8 @@ CommandResult CheckIrregularEntries() {
     int entryNumber = 0, regularCount = 0;
     std::string line;
     while (NextCatalogueLine(reader, line)) {
-        if (RaisesEntryNumber(line)) ++entryNumber;
+        // Five characters, one more than a building header needs: "[bui" alone opens no entry here.
+        if (StartsWith(line, "[buil")) ++entryNumber;
         if (std::string_view prefix = RegularLinePrefixOf(line); !prefix.empty()) {
             ++regularCount;
             if (ProgressListOn) {

@@ -13,8 +13,6 @@ struct IrregularEntry {
 
 // The first known prefix the line begins with, or "" when it begins with none.
 std::string_view RegularLinePrefixOf(const std::string& line);
-// Whether the line opens a new entry for the numbering of irregular lines.
-bool RaisesEntryNumber(const std::string& line);
 std::string IrregularEntryLine(const IrregularEntry& entry);
 
 CommandResult CheckIrregularEntries();

@@ -12,14 +12,6 @@ TEST(CliOptions, TakesCommandAndOptionsInAnyOrder) {
     EXPECT_EQ(options.reportDir, "out");
     EXPECT_TRUE(options.progress);
     EXPECT_FALSE(options.help);
-
-    ASSERT_TRUE(ParseCliOptions({"doubled-objects"}, options, error));
-    EXPECT_EQ(options.command, "doubled-objects");
-    EXPECT_EQ(options.catalogue, "");
-    EXPECT_FALSE(options.progress);
-
-    ASSERT_TRUE(ParseCliOptions({"--help"}, options, error));
-    EXPECT_TRUE(options.help);
 }
 
 TEST(CliOptions, RejectsBadUsageWithReason) {
