@@ -41,6 +41,7 @@ void CloseEverything() {
 
 int RunVerrant() {
     ClearAppState();
+    InitPlatform();
     OpenMainWindow();
     StartFolder = CurrentFolderWithBackslash();
     if (LoadSettings(StartFolder)) AskForCatalogueFolderAtStart();
