@@ -16,7 +16,9 @@ cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_TESTS=OFF >/dev
     cmake --build build/release -j"$(nproc)" --target verrant-cli >/dev/null || exit 2
 
 cli="$top/build/release/src/verrant-cli"
-catalogue="$top/examples/demo-tree/mods/std/com/maddox/il2/objects"
+# A fresh copy each time: renumbering rewrites the catalogue it is given.
+rm -rf "$top/build/demo-tree" && cp -r "$top/examples/demo-tree" "$top/build/demo-tree"
+catalogue="$top/build/demo-tree/mods/std/com/maddox/il2/objects"
 reports="$top/build/demo-reports"
 mkdir -p "$reports"
 for command in $("$cli" --help | sed -n 's/^  \([a-z+-]*\) .*/\1/p' | grep -v '^-'); do

@@ -3,6 +3,8 @@
 // rewritten, or the list written), 1 findings, 2 bad usage or a catalogue or report that could not
 // be read or written.
 #include "checks/doubled_objects.h"
+#include "checks/empty_references.h"
+#include "checks/irregular_entries.h"
 #include "cli/cli_options.h"
 #include "platform/headless/headless.h"
 #include "rewrite/mission_builder_list.h"
@@ -12,7 +14,6 @@
 #include "shell/progress_list.h"
 
 #include <cstdio>
-#include <filesystem>
 #include <functional>
 
 namespace {
@@ -33,6 +34,12 @@ CommandResult InCatalogueFolder(CommandResult (*command)(const std::string&, con
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"irregular-entries", "lines that begin with none of the known prefixes",
+     [](const CliOptions&) { return CheckIrregularEntries(); }},
+    {"empty-references", "Mesh, MeshLive and MeshDead lines without a value",
+     [](const CliOptions&) {
+         return EnsureCatalogueFolderKnown() ? FindEmptyReferences(CatalogueFolder) : CommandResult::NoFolder;
+     }},
     {"renumber", "rewrites static.ini with a number line above every building header",
      [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "renumber"); }},
     {"denumber", "rewrites static.ini without its number lines",
@@ -91,8 +98,8 @@ int main(int argc, char** argv) {
     StartFolder = ProgramFolder(".");
     if (!options.catalogue.empty()) CatalogueFolder = ProgramFolder(options.catalogue);
     std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
-    std::error_code fsError;
-    if (!std::filesystem::is_directory(reportDir, fsError)) {
+    // Through the file layer, so that the folder's name matches as the catalogue's does.
+    if (!MakeFolderCurrent(ProgramFolder(reportDir))) {
         std::fprintf(stderr, "verrant-cli: report folder %s does not exist\n", reportDir.c_str());
         return ExitTrouble;
     }

@@ -1,6 +1,8 @@
 #include "shell/event_loop.h"
 
 #include "checks/doubled_objects.h"
+#include "checks/empty_references.h"
+#include "checks/irregular_entries.h"
 #include "location/catalogue_folder.h"
 #include "location/settings.h"
 #include "rewrite/mission_builder_list.h"
@@ -17,6 +19,12 @@ void RunMenuCommand(int id) {
     switch (id) {
         case MenuDoubledObjects:
             FindDoubledObjects();
+            break;
+        case MenuIrregularEntries:
+            CheckIrregularEntries();
+            break;
+        case MenuEmptyReferences:
+            if (EnsureCatalogueFolderKnown()) FindEmptyReferences(CatalogueFolder);
             break;
         case MenuSavePath:
             if (EnsureCatalogueFolderKnown()) SavePath(CatalogueFolder, StartFolder);
@@ -38,10 +46,8 @@ void RunMenuCommand(int id) {
             break;
         // Commands whose procedures come with their own units: one line each above when they land.
         case MenuMissingObjects:
-        case MenuIrregularEntries:
         case MenuWrongSimReferences:
         case MenuDoubledUsedSims:
-        case MenuEmptyReferences:
             break;
         case MenuCredit:
             break;
