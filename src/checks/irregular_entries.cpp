@@ -8,6 +8,7 @@
 #include "shell/progress_list.h"
 #include "shell/reports.h"
 
+#include <array>
 #include <vector>
 
 namespace {
@@ -42,8 +43,17 @@ const std::string Ruler41(41, '*');
 
 }  // namespace
 
+// A line is tried only against the prefixes that begin with its first byte, in table order; no
+// other prefix can match it, so the first that does is still the first of the whole table.
 std::string_view RegularLinePrefixOf(const std::string& line) {
-    for (std::string_view prefix : RegularLinePrefixes)
+    static const std::array<std::vector<std::string_view>, 256> byFirstByte = [] {
+        std::array<std::vector<std::string_view>, 256> table;
+        for (std::string_view prefix : RegularLinePrefixes)
+            table[static_cast<unsigned char>(prefix[0])].push_back(prefix);
+        return table;
+    }();
+    if (line.empty()) return {};
+    for (std::string_view prefix : byFirstByte[static_cast<unsigned char>(line[0])])
         if (line.compare(0, prefix.size(), prefix) == 0) return prefix;
     return {};
 }

@@ -4,6 +4,7 @@
 #include "catalogue/catalogue_reader.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
+#include "shell/progress_list.h"
 
 #include <cstdio>
 #include <cstdlib>
@@ -80,6 +81,21 @@ std::string BaselineOutput(const std::string& baseline, const std::string& repor
     exists = false;
     if (!RunBaseline(baseline, input)) return "";
     return rewrite ? ReadScratchFile("copy/static.ini", exists) : ReadScratchFile("baseline/" + report, exists);
+}
+
+CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
+                                      const std::string& report, const std::string& baseline, bool& written) {
+    ResetForInput();
+    WriteScratchFile("static.ini", std::string(reinterpret_cast<const char*>(data), size));
+    CatalogueFolder = ScratchFolder();
+    ProgressListOn = size > 0 && (data[0] & 1);
+    if (ProgressListOn) OpenProgressList();
+    CommandResult result = check();
+    std::string text = ReadDesktopFile(report, written);
+    bool expected = false;
+    std::string plain = BaselineOutput(baseline, report, expected);
+    Require(written == expected && text == plain, "the report is the straightforward method's");
+    return result;
 }
 
 void Require(bool holds, const char* what) {

@@ -2,6 +2,8 @@
 // headless platform set up afresh for each input.
 #pragma once
 
+#include "shell/command_result.h"
+
 #include <cstddef>
 #include <cstdint>
 #include <string>
@@ -20,6 +22,11 @@ std::string ReadDesktopFile(const std::string& name, bool& exists);
 // Runs a bench baseline on the scratch catalogue and gives the report it wrote (or, for
 // "@static.ini", the catalogue it rewrote, which must then be a copy in the folder "copy").
 std::string BaselineOutput(const std::string& baseline, const std::string& report, bool& exists);
+// Runs a catalogue check on the input as static.ini (the progress list on for an odd first byte)
+// and requires its report to be the baseline's, byte for byte, or both to write none. Gives the
+// check's result and whether a report was written.
+CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
+                                      const std::string& report, const std::string& baseline, bool& written);
 // Stops the run with a message when a property fails; libFuzzer keeps the input.
 void Require(bool holds, const char* what);
 // The lines of a catalogue as the program's reader gives them, trimmed or not.

@@ -1,0 +1,26 @@
+// ".. empty references" on arbitrary catalogues: the report, always written, against the plain scan.
+#include "fuzz_support.h"
+
+#include "checks/empty_references.h"
+#include "shell/app_state.h"
+
+#include <string_view>
+
+namespace {
+
+CommandResult FindInScratchCatalogue() { return FindEmptyReferences(CatalogueFolder); }
+
+}  // namespace
+
+extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
+    bool written = false;
+    CommandResult result =
+        RunCheckAgainstBaseline(data, size, FindInScratchCatalogue, "Empty_references.txt", "bare-keys", written);
+    bool exists = false;
+    std::string report = ReadDesktopFile("Empty_references.txt", exists);
+    bool none = std::string_view(report).ends_with("\r\n\r\nNo empty references found in your static.ini") &&
+                report.find("Empty reference: ") == std::string::npos;
+    Require(written, "the report is always written");
+    Require(result == (none ? CommandResult::NothingFound : CommandResult::Findings), "the result");
+    return 0;
+}
