@@ -2,6 +2,7 @@
 // byte for byte as the desktop program writes them; exit status 0 nothing found, 1 findings,
 // 2 bad usage or a catalogue or report that could not be read or written.
 #include "checks/doubled_objects.h"
+#include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
@@ -22,6 +23,7 @@ struct CliCommand {
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"missing-objects", "objects a map (--map FILE) places that the catalogue lacks", RunMissingObjectsCommand},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
@@ -32,6 +34,7 @@ void PrintHelp(std::FILE* to) {
                  "  --catalogue DIR   the folder that holds static.ini\n"
                  "  --report-dir DIR  where the report is written (default: the current folder)\n"
                  "  --progress        print the progress list's lines to standard output\n"
+                 "  --map FILE        missing-objects: the map file; without --catalogue, its tree's catalogue\n"
                  "commands:\n");
     for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
 }
