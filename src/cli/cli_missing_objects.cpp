@@ -1,5 +1,6 @@
 #include "cli/cli_missing_objects.h"
 
+#include "catalogue/text.h"
 #include "location/catalogue_folder.h"
 #include "location/catalogue_from_map.h"
 #include "maps/missing_map_objects.h"
@@ -17,11 +18,16 @@ CommandResult RunMissingObjectsCommand(const CliOptions& options) {
     // The file name stays as the user wrote it: only "static.ini" itself is refused unread.
     std::string path = HeadlessProgramPath(options.map);
     std::size_t slash = path.rfind('\\');
-    std::string selection = path.substr(0, slash + 1) + "*" + path.substr(slash + 1);
+    std::string mapFolder = path.substr(0, slash + 1);
+    std::string selection = mapFolder + "*" + path.substr(slash + 1);
     if (!ValidateMapFile(0, selection)) return CommandResult::Failed;
 
     if (CatalogueFolder.empty()) {
         CatalogueFolder = DeriveCatalogueFolderFromMap(selection);
+        // Without a "mod" in the path the folder is relative, as the desktop program takes it: to
+        // the map's folder, which the validation left current.
+        bool absolute = StartsWith(CatalogueFolder, "\\") || CatalogueFolder.compare(1, 1, ":") == 0;
+        if (!absolute) CatalogueFolder = mapFolder + CatalogueFolder;
         if (!FolderHoldsCatalogue(CatalogueFolder)) {
             std::fprintf(stderr, "static.ini not found: %s\n", HeadlessHostPath(CatalogueFolder).c_str());
             return CommandResult::Failed;
