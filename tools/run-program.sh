@@ -17,11 +17,12 @@ cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_TESTS=OFF >/dev
 
 cli="$top/build/release/src/verrant-cli"
 catalogue="$top/examples/demo-tree/mods/std/com/maddox/il2/objects"
+map="$top/examples/demo-tree/mods/mapmods/maps/Coast/actors.static"
 reports="$top/build/demo-reports"
 mkdir -p "$reports"
 for command in $("$cli" --help | sed -n 's/^  \([a-z+-]*\) .*/\1/p' | grep -v '^-'); do
     echo "== verrant-cli $command"
-    "$cli" "$command" --catalogue "$catalogue" --report-dir "$reports"
+    "$cli" "$command" --catalogue "$catalogue" --map "$map" --report-dir "$reports"
     echo "   exit status $?"
 done
 echo "Reports in $reports"
