@@ -26,7 +26,8 @@ double BestTime(Work work) {
     for (int run = 0; run < 5; ++run) {
         auto start = std::chrono::steady_clock::now();
         work();
-        best = std::min(best, std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count());
+        best =
+            std::min(best, std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count());
     }
     return best;
 }
@@ -49,12 +50,13 @@ std::vector<std::string> PlacedClassNames() {
 std::string Catalogue() {
     std::string text = "[***]\r\nTitle Bench\r\n";
     for (int i = 0; i < CatalogueHeaders; ++i)
-        text += "[buildings.House$Obj" + std::to_string(i) + "]\r\nMesh          3do/Bench/" + std::to_string(i) +
-                "/mono.sim\r\n";
+        text += "[buildings.House$Obj" + std::to_string(i) + "]\r\nMesh          3do/Bench/" +
+                std::to_string(i) + "/mono.sim\r\n";
     return text;
 }
 
-std::vector<int> WalkedOrdinals(const std::vector<std::string>& names, const std::vector<std::string>& sections) {
+std::vector<int> WalkedOrdinals(const std::vector<std::string>& names,
+                                const std::vector<std::string>& sections) {
     std::vector<int> ordinals;
     for (const std::string& name : names) {
         int found = NotInCatalogue;
@@ -101,9 +103,11 @@ int main(int argc, char** argv) {
 
     // Beyond the bytes the check reads: every placed name looked up, as a larger window would need.
     std::vector<std::string> allNames;
-    for (const std::string& className : PlacedClassNames()) allNames.push_back(className.substr(className.find("build")));
+    for (const std::string& className : PlacedClassNames())
+        allNames.push_back(className.substr(className.find("build")));
     double allIndexed = BestTime([&] { FirstSectionOrdinals(allNames, sections); });
-    double allWalkedEstimate = walkedLookup / static_cast<double>(names.size()) * static_cast<double>(allNames.size());
+    double allWalkedEstimate =
+        walkedLookup / static_cast<double>(names.size()) * static_cast<double>(allNames.size());
 
     std::printf("map: %d placed names, %zu of them within the 140,000 bytes read; catalogue: %zu headers\n",
                 PlacedNames, names.size(), sections.size());
@@ -111,7 +115,8 @@ int main(int argc, char** argv) {
     std::printf("lookup of the %zu names: by index %.4f s, by walk %.4f s, ratio %.0f, same ordinals: %s\n",
                 names.size(), indexedLookup, walkedLookup, walkedLookup / indexedLookup,
                 indexed == walked ? "yes" : "NO");
-    std::printf("lookup of all %zu names: by index %.4f s, by walk about %.0f s (estimated), ratio about %.0f\n",
-                allNames.size(), allIndexed, allWalkedEstimate, allWalkedEstimate / allIndexed);
+    std::printf(
+        "lookup of all %zu names: by index %.4f s, by walk about %.0f s (estimated), ratio about %.0f\n",
+        allNames.size(), allIndexed, allWalkedEstimate, allWalkedEstimate / allIndexed);
     return indexed == walked ? 0 : 1;
 }

@@ -55,8 +55,10 @@ std::string MapTextOf(std::string_view bytes) {
     text.reserve(bytes.size());
     for (char c : bytes) {
         unsigned char byte = static_cast<unsigned char>(c);
-        if (byte == 0) text += ' ';
-        else if (byte >= 33 && byte <= 122) text += c;
+        if (byte == 0)
+            text += ' ';
+        else if (byte >= 33 && byte <= 122)
+            text += c;
     }
     return text;
 }

@@ -9,9 +9,11 @@ TEST(CatalogueFromMap, DerivesTheFolderBeforeTheFirstMod) {
         std::string selection, folder;
     };
     const Case cases[] = {
-        {"D:\\Sim\\MODS\\MapMods\\maps\\Fields\\*actors.static", "D:\\Sim\\mods\\std\\com\\maddox\\il2\\objects\\"},
+        {"D:\\Sim\\MODS\\MapMods\\maps\\Fields\\*actors.static",
+         "D:\\Sim\\mods\\std\\com\\maddox\\il2\\objects\\"},
         {"D:\\Sim\\mods\\mapmods\\maps\\Fields\\*", "D:\\Sim\\mods\\std\\com\\maddox\\il2\\objects\\"},
-        {"D:\\Modding\\Sim\\MODS\\MapMods\\maps\\A\\*actors.static", "D:\\mods\\std\\com\\maddox\\il2\\objects\\"},
+        {"D:\\Modding\\Sim\\MODS\\MapMods\\maps\\A\\*actors.static",
+         "D:\\mods\\std\\com\\maddox\\il2\\objects\\"},
         {"D:\\Sim\\Maps\\Fields\\*actors.static", "mods\\std\\com\\maddox\\il2\\objects\\"},
         {"mods\\maps\\*actors.static", "mods\\std\\com\\maddox\\il2\\objects\\"},
         {"", "mods\\std\\com\\maddox\\il2\\objects\\"},

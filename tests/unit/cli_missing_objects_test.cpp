@@ -23,13 +23,15 @@ protected:
         ASSERT_EQ(root.find("mod"), std::string::npos) << "the tree must be the first \"mod\" in its paths";
         Write("Sim/Mods/std/com/maddox/il2/objects/static.ini", "[buildings.House$Kiosk]\r\n");
         Write("Sim/Mods/MapMods/maps/Fields/actors.static",
-              MapRecordBytes({BuildingClassName("Barn"), BuildingClassName("Kiosk"), BuildingClassName("Barn")}));
+              MapRecordBytes(
+                  {BuildingClassName("Barn"), BuildingClassName("Kiosk"), BuildingClassName("Barn")}));
         Write("Sim/Mods/MapMods/maps/Calm/actors.static", MapRecordBytes({BuildingClassName("Kiosk")}));
         Write("reports/.keep", "");
     }
     CliRun Run(const std::string& arguments) {
-        std::string command = Quoted(VERRANT_CLI_PATH) + " missing-objects --report-dir " + Quoted(Host("reports")) +
-                              " " + arguments + " >" + Quoted(Host("out")) + " 2>" + Quoted(Host("err"));
+        std::string command = Quoted(VERRANT_CLI_PATH) + " missing-objects --report-dir " +
+                              Quoted(Host("reports")) + " " + arguments + " >" + Quoted(Host("out")) + " 2>" +
+                              Quoted(Host("err"));
         CliRun run;
         int raw = std::system(command.c_str());
         run.status = WIFEXITED(raw) ? WEXITSTATUS(raw) : -1;
@@ -37,15 +39,17 @@ protected:
         run.err = Read("err");
         return run;
     }
-    std::string Map(const std::string& name) { return "--map " + Quoted(Host("Sim/Mods/MapMods/maps/" + name)); }
+    std::string Map(const std::string& name) {
+        return "--map " + Quoted(Host("Sim/Mods/MapMods/maps/" + name));
+    }
 };
 
 TEST_F(CliMissingObjectsTest, CatalogueFoundFromTheMapPath) {
     CliRun run = Run(Map("Fields/actors.static"));
     EXPECT_EQ(run.status, 1);
     EXPECT_EQ(run.err, "");
-    EXPECT_EQ(Read("reports/Missing_objects.txt"),
-              CrLf({"Missing objects in your static.ini:", "", "buildings.House$Barn", "buildings.House$Barn"}));
+    EXPECT_EQ(Read("reports/Missing_objects.txt"), CrLf({"Missing objects in your static.ini:", "",
+                                                         "buildings.House$Barn", "buildings.House$Barn"}));
 }
 
 TEST_F(CliMissingObjectsTest, AllFoundExitsZeroWithoutReport) {

@@ -68,11 +68,12 @@ protected:
 };
 
 TEST_F(FindMissingMapObjectsTest, ReportListsEveryMissingOccurrenceInMapOrder) {
-    UseCatalogue("[buildings.House$Kiosk]\r\n"
-                 "  [buildings.House$Barn] // moved\r\n"
-                 "\t[buildings.House$Shed]\r\n"
-                 "[Buildings.House$Tower]\r\n"
-                 "[buildings.House$mill]\r\n");
+    UseCatalogue(
+        "[buildings.House$Kiosk]\r\n"
+        "  [buildings.House$Barn] // moved\r\n"
+        "\t[buildings.House$Shed]\r\n"
+        "[Buildings.House$Tower]\r\n"
+        "[buildings.House$mill]\r\n");
     std::string selection = UseMap(ClassNames({"Shed", "Kiosk", "Mill", "Barn", "Shed", "Tower", "Shed"}));
     EXPECT_EQ(FindMissingMapObjects(selection, CatalogueFolder), CommandResult::Findings);
     EXPECT_EQ(Desktop("Missing_objects.txt"),
@@ -99,7 +100,8 @@ TEST_F(FindMissingMapObjectsTest, ListOffGivesTheSameReportAndNoLines) {
     UseCatalogue(Headers({"A"}));
     std::string selection = UseMap(ClassNames({"A", "Z"}));
     EXPECT_EQ(FindMissingMapObjects(selection, CatalogueFolder), CommandResult::Findings);
-    EXPECT_EQ(Desktop("Missing_objects.txt"), CrLf({"Missing objects in your static.ini:", "", "buildings.House$Z"}));
+    EXPECT_EQ(Desktop("Missing_objects.txt"),
+              CrLf({"Missing objects in your static.ini:", "", "buildings.House$Z"}));
     EXPECT_EQ(ProgressList, 0u);
 }
 
@@ -119,7 +121,8 @@ TEST_F(FindMissingMapObjectsTest, AllFoundOrNoNamesShowsMessageAndWritesNoReport
         std::string selection = UseMap(c.classNames);
         ListOn();
         EXPECT_EQ(FindMissingMapObjects(selection, CatalogueFolder), CommandResult::NothingFound);
-        EXPECT_EQ(Messages(), Strings({"No missing objects found: All maps objects found in your static.ini"}));
+        EXPECT_EQ(Messages(),
+                  Strings({"No missing objects found: All maps objects found in your static.ini"}));
         EXPECT_EQ(ProgressLines().back(), c.total);
         EXPECT_EQ(ProgressLines()[ProgressLines().size() - 2], "");
         EXPECT_FALSE(Exists("Desktop/Missing_objects.txt"));

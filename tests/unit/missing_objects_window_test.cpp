@@ -48,7 +48,8 @@ TEST_F(MissingObjectsWindowTest, LayoutAndFileListStart) {
     struct Case {
         std::string mapsPattern, browserPath;
     };
-    const Case cases[] = {{"D:\\Sim\\Mods\\mapmods\\maps\\*.*", "D:\\Sim\\Mods\\mapmods\\maps\\*.*"}, {"", "*.*"}};
+    const Case cases[] = {{"D:\\Sim\\Mods\\mapmods\\maps\\*.*", "D:\\Sim\\Mods\\mapmods\\maps\\*.*"},
+                          {"", "*.*"}};
     for (const Case& c : cases) {
         HeadlessReset();
         HeadlessScript(Look());
@@ -65,13 +66,14 @@ TEST_F(MissingObjectsWindowTest, LayoutAndFileListStart) {
         Strings controls;
         for (Handle handle : shown->controls) {
             const HeadlessControl* control = HeadlessControlOf(handle);
-            controls.push_back(control->kind + " " + control->text + " " + std::to_string(control->left) + "," +
-                               std::to_string(control->top) + " " + std::to_string(control->width) + "x" +
-                               std::to_string(control->height));
+            controls.push_back(control->kind + " " + control->text + " " + std::to_string(control->left) +
+                               "," + std::to_string(control->top) + " " + std::to_string(control->width) +
+                               "x" + std::to_string(control->height));
         }
-        EXPECT_EQ(controls, Strings({"label Select mod maps file of type 'actors.static' to examine 10,10 284x20",
-                                     "browser  10,30 304x250", "textbox  10,300 304x20",
-                                     "push Close 10,330 50x25", "push OK 289,330 25x25"}));
+        EXPECT_EQ(controls,
+                  Strings({"label Select mod maps file of type 'actors.static' to examine 10,10 284x20",
+                           "browser  10,30 304x250", "textbox  10,300 304x20", "push Close 10,330 50x25",
+                           "push OK 289,330 25x25"}));
         EXPECT_EQ(HeadlessControlOf(shown->controls[1])->browserPath, c.browserPath);
     }
 }
@@ -85,8 +87,9 @@ TEST_F(MissingObjectsWindowTest, OkWithoutAFilePickedSaysNoFileSelected) {
         {"nothing picked", {ControlStep(Title, OkId)}},
         {"folder picked", {BrowserStep(Title, Maps(), "Fields", false), ControlStep(Title, OkId)}},
         {"top level", {BrowserStep(Title, "", "C:", false), ControlStep(Title, OkId)}},
-        {"file, then folder", {BrowserStep(Title, Fields(), "actors.static", true),
-                               BrowserStep(Title, Fields(), "", false), ControlStep(Title, OkId)}},
+        {"file, then folder",
+         {BrowserStep(Title, Fields(), "actors.static", true), BrowserStep(Title, Fields(), "", false),
+          ControlStep(Title, OkId)}},
     };
     for (const Case& c : cases) {
         HeadlessReset();
@@ -106,7 +109,8 @@ TEST_F(MissingObjectsWindowTest, PickingTheMapAndOkWritesTheReportAndKeepsTheFol
     HeadlessScript(Look());
     HeadlessScript(ControlStep(Title, CloseId));
     ShowMissingObjectsWindow(Maps() + "*.*");
-    EXPECT_EQ(Desktop("Missing_objects.txt"), CrLf({"Missing objects in your static.ini:", "", "buildings.House$Barn"}));
+    EXPECT_EQ(Desktop("Missing_objects.txt"),
+              CrLf({"Missing objects in your static.ini:", "", "buildings.House$Barn"}));
     EXPECT_EQ(HeadlessProcesses().size(), 2u);
     EXPECT_EQ(CatalogueFolder, Folder("Sim") + "mods\\std\\com\\maddox\\il2\\objects\\");
     EXPECT_EQ(status, ShownMapPath(Fields() + "actors.static"));
@@ -123,7 +127,8 @@ TEST_F(MissingObjectsWindowTest, FilesThatAreNoMapsAreRefused) {
         HeadlessScript(ControlStep(Title, OkId));
         HeadlessScript(Look());
         ShowMissingObjectsWindow("");
-        EXPECT_EQ(Messages(), Strings({"Wrong file selected: This is not a file of type 'actor.static'"})) << name;
+        EXPECT_EQ(Messages(), Strings({"Wrong file selected: This is not a file of type 'actor.static'"}))
+            << name;
         EXPECT_EQ(status, ShownMapPath(Fields() + name)) << name;
         EXPECT_TRUE(HeadlessProcesses().empty()) << name;
     }
