@@ -19,11 +19,12 @@ cli="$top/build/release/src/verrant-cli"
 # A fresh copy each time: renumbering rewrites the catalogue it is given.
 rm -rf "$top/build/demo-tree" && cp -r "$top/examples/demo-tree" "$top/build/demo-tree"
 catalogue="$top/build/demo-tree/mods/std/com/maddox/il2/objects"
+map="$top/build/demo-tree/mods/mapmods/maps/Coast/actors.static"
 reports="$top/build/demo-reports"
 mkdir -p "$reports"
 for command in $("$cli" --help | sed -n 's/^  \([a-z+-]*\) .*/\1/p' | grep -v '^-'); do
     echo "== verrant-cli $command"
-    "$cli" "$command" --catalogue "$catalogue" --report-dir "$reports"
+    "$cli" "$command" --catalogue "$catalogue" --map "$map" --report-dir "$reports"
     echo "   exit status $?"
 done
 echo "Reports in $reports"
