@@ -10,6 +10,10 @@
 
 using Handle = std::uintptr_t;  // a window, control, menu or open file; 0 means none
 
+// Once at start, before the first window: common controls, COM in a single-threaded apartment, and
+// no critical-error boxes (a drive that is not ready just fails).
+void InitPlatform();
+
 //--- windows
 
 struct FrameStyle {
