@@ -87,7 +87,7 @@ void ExpectCaptionsFit(Program& program, HWND window, const std::string& what) {
         Strings fields = SplitTabs(line);
         if (fields.size() < 4 || fields[0].empty()) continue;
         Expect(fields[3] != "(system font)" && fields[3] != "System", what + ": \"" + fields[0] + "\" has a normal font");
-        Expect(std::stoi(fields[1]) + 8 <= std::stoi(fields[2]),
+        Expect(std::stoi(fields[1]) + 4 <= std::stoi(fields[2]),  // two pixels of border on each side
                what + ": \"" + fields[0] + "\" needs " + fields[1] + " of " + fields[2] + " pixels");
     }
 }
@@ -315,6 +315,7 @@ void DoubledObjectsWithProgressList() {
     Expect(SendMessageA(toggle, BM_GETCHECK, 0, 0) == BST_CHECKED, "the toggle stays down");
     ExpectFrame(progress, 650, 320, 370, 470, "progress list window");
     ExpectStyle(progress, false, false, "progress list window");
+    Expect((GetClassLongA(progress, GCL_STYLE) & CS_NOCLOSE) != 0, "Alt+F4 cannot close the progress list window");
     HWND list = ProgressList(progress);
     ExpectPlace(list, 10, 20, 350, 430, "progress list");
     LONG style = GetWindowLongA(list, GWL_STYLE);
@@ -386,6 +387,22 @@ void NoFindingsDisablesProgressList() {
     Expect(Finish(program) == 0, "exit code 0");
 }
 
+// The program file carries its version and its icon.
+void ProgramFileResources() {
+    DWORD ignored = 0;
+    DWORD size = GetFileVersionInfoSizeA(Settings.program.c_str(), &ignored);
+    Require(size > 0, "verrant.exe has a version resource");
+    std::string data(size, '\0');
+    Require(GetFileVersionInfoA(Settings.program.c_str(), 0, size, data.data()) != FALSE, "the version resource reads");
+    char* product = nullptr;
+    UINT length = 0;
+    Expect(VerQueryValueA(data.data(), "\\StringFileInfo\\040904B0\\ProductName", reinterpret_cast<void**>(&product),
+                          &length) &&
+               std::string(product) == "Verrant",
+           "the product name is Verrant");
+    Expect(ExtractIconExA(Settings.program.c_str(), -1, nullptr, nullptr, 0) >= 1, "verrant.exe carries an icon");
+}
+
 struct Scenario {
     const char* name;
     std::function<void()> run;
@@ -409,6 +426,7 @@ int main(int argc, char** argv) {
     MakeFixtures();
 
     const Scenario scenarios[] = {
+        {"program file: version resource and icon", ProgramFileResources},
         {"first start: question, chooser, closing it; main window, buttons, menu table; Close",
          FirstStartAndMainWindow},
         {"chooser: wrong folder, then a folder with static.ini; settings file bytes; close box", ChooseFolderAndSave},

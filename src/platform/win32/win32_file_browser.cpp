@@ -34,7 +34,8 @@ struct FileBrowser {
 
 std::map<HWND, FileBrowser> Browsers;  // by list view
 
-const int NameColumnWidth = 132, TypeColumnWidth = 64, ModifiedColumnWidth = 100;
+// Together with a vertical scroll bar the columns fit the chooser's 304 pixels.
+const int NameColumnWidth = 122, TypeColumnWidth = 60, ModifiedColumnWidth = 100;
 
 std::string WithBackslash(std::string folder) {
     if (!folder.empty() && folder.back() != '\\') folder += '\\';
@@ -167,7 +168,7 @@ std::vector<BrowserEntry> FolderEntries(const std::string& folder, const std::st
     parent.name = "..";
     parent.kind = EntryKind::Parent;
     parent.target = ParentFolder(folder);
-    parent.type = "Parent folder";
+    parent.type = "Parent";
     parent.icon = LookOf(folder, true).icon;
     entries.push_back(parent);
     AddListedEntries(folder + "*", true, entries);
