@@ -10,8 +10,8 @@
 
 using Handle = std::uintptr_t;  // a window, control, menu or open file; 0 means none
 
-// Once at start, before the first window: common controls, COM in a single-threaded apartment, and
-// no critical-error boxes (a drive that is not ready just fails).
+// Once at start: common controls (version 6, as the manifest asks), COM single-threaded, and no
+// critical-error boxes (a drive that is not ready just fails).
 void InitPlatform();
 
 //--- windows
