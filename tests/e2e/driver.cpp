@@ -18,7 +18,8 @@ std::string CleanCatalogue() { return Work("clean\\" + CatalogueTail); }
 
 std::string Headers(const Strings& names) {
     std::string text = "[***]\r\nTitle Houses\r\n";
-    for (const std::string& name : names) text += "[buildings.House$" + name + "]\r\nMesh 3do/Buildings/x/live.sim\r\n";
+    for (const std::string& name : names)
+        text += "[buildings.House$" + name + "]\r\nMesh 3do/Buildings/x/live.sim\r\n";
     return text;
 }
 
@@ -75,8 +76,10 @@ void ExpectFrame(HWND window, int left, int top, int clientWidth, int clientHeig
 void ExpectStyle(HWND window, bool systemMenu, bool sizingBorder, const std::string& what) {
     LONG style = GetWindowLongA(window, GWL_STYLE);
     Expect((style & WS_CAPTION) == WS_CAPTION, what + " has a title bar");
-    Expect(((style & WS_SYSMENU) != 0) == systemMenu, what + (systemMenu ? " has" : " has no") + " system menu");
-    Expect(((style & WS_THICKFRAME) != 0) == sizingBorder, what + (sizingBorder ? " has" : " has no") + " sizing border");
+    Expect(((style & WS_SYSMENU) != 0) == systemMenu,
+           what + (systemMenu ? " has" : " has no") + " system menu");
+    Expect(((style & WS_THICKFRAME) != 0) == sizingBorder,
+           what + (sizingBorder ? " has" : " has no") + " sizing border");
     Expect((style & (WS_MINIMIZEBOX | WS_MAXIMIZEBOX)) == 0, what + " has no minimize or maximize box");
 }
 
@@ -86,7 +89,8 @@ void ExpectCaptionsFit(Program& program, HWND window, const std::string& what) {
     for (const std::string& line : SplitLines(Probe(program, window, ProbeCaptions))) {
         Strings fields = SplitTabs(line);
         if (fields.size() < 4 || fields[0].empty()) continue;
-        Expect(fields[3] != "(system font)" && fields[3] != "System", what + ": \"" + fields[0] + "\" has a normal font");
+        Expect(fields[3] != "(system font)" && fields[3] != "System",
+               what + ": \"" + fields[0] + "\" has a normal font");
         Expect(std::stoi(fields[1]) + 4 <= std::stoi(fields[2]),  // two pixels of border on each side
                what + ": \"" + fields[0] + "\" needs " + fields[1] + " of " + fields[2] + " pixels");
     }
@@ -101,7 +105,8 @@ HWND Control(HWND window, const char* windowClass, int index = 0) {
 HWND ProgressList(HWND window) { return Control(window, "ListBox"); }
 
 void AnswerStartQuestion(const Program& program) {
-    ConfirmMessage(program, "Path to static.ini", "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first");
+    ConfirmMessage(program, "Path to static.ini",
+                   "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first");
 }
 
 HWND ChooserWindow(const Program& program) {
@@ -132,8 +137,9 @@ void BrowseTo(Program& program, HWND chooser, const std::string& folder) {
         std::string row = first ? name + "\\" : name;
         reached += name + "\\";
         OpenBrowserRow(program, chooser, row, first);
-        Require(WaitForChooserPath(chooser, reached), "the path box shows " + reached + " after opening " + row +
-                                                          " (it shows \"" + ChooserPath(chooser) + "\")");
+        Require(WaitForChooserPath(chooser, reached), "the path box shows " + reached + " after opening " +
+                                                          row + " (it shows \"" + ChooserPath(chooser) +
+                                                          "\")");
         start = slash + 1;
         first = false;
     }
@@ -153,7 +159,8 @@ void FirstStartAndMainWindow() {
     MessageBoxSeen question = WaitForMessageBox(program);
     Expect(IsWindowVisible(program.main) != FALSE, "the main window is visible during the start question");
     ExpectText(question.title, "Path to static.ini", "start question title");
-    ExpectText(question.text, "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first", "start question");
+    ExpectText(question.text, "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first",
+               "start question");
     Expect(!question.hasIcon, "the start question has no icon");
     Expect(question.owner == program.main, "the start question is owned by the main window");
     DismissMessageBox(question);
@@ -175,8 +182,10 @@ void FirstStartAndMainWindow() {
     ExpectText(rows.empty() ? "" : rows[0], "columns\tName\tType\tModified", "browser columns");
     Strings names = BrowserRowNames(program, chooser);
     Expect(std::find(names.begin(), names.end(), "C:\\") != names.end(), "the top level shows drive C:");
-    Expect(std::find(names.begin(), names.end(), "Documents") != names.end(), "the top level shows Documents");
+    Expect(std::find(names.begin(), names.end(), "Documents") != names.end(),
+           "the top level shows Documents");
     ExpectCaptionsFit(program, chooser, "chooser");
+    Screenshot("chooser-top-level");
     OpenBrowserRow(program, chooser, "C:\\", false);
     WaitForChooserPath(chooser, "C:\\");
     Screenshot("chooser");
@@ -208,23 +217,34 @@ void FirstStartAndMainWindow() {
     std::vector<std::string> items(menu.begin() + 1, menu.end());
     Require(!items.empty(), "the menu has items");
     Strings credit = SplitTabs(items.back());
-    Expect(credit.size() == 5 && credit[0] == "1" && credit[1] == "item" && credit[2] == "13" && !credit[4].empty() &&
-               credit[4].find('\t') == std::string::npos,
+    Expect(credit.size() == 5 && credit[0] == "1" && credit[1] == "item" && credit[2] == "13" &&
+               !credit[4].empty() && credit[4].find('\t') == std::string::npos,
            "the last item is the credit item, id 13 under \"?\": " + items.back());
     items.back() = "1\titem\t13\tenabled\t(credit)";
     for (std::string& item : items)
         if (item.rfind("1\tseparator", 0) == 0) item = "1\tseparator";
     ExpectLines(items,
-                {"0\tsub\t0\tenabled\tFile", "1\titem\t1\tenabled\tClose", "0\tsub\t0\tenabled\tSearch",
-                 "1\titem\t2\tenabled\t.. missing objects", "1\titem\t3\tenabled\t.. doubled objects",
-                 "1\titem\t4\tenabled\t.. irregular entrys", "1\tseparator",
-                 "1\tsub\t0\tenabled\t.. reference stuff", "2\titem\t5\tenabled\t.. wrong sim references",
-                 "2\titem\t14\tenabled\t.. doubled used sims", "2\titem\t15\tenabled\t.. empty references",
-                 "0\tsub\t0\tenabled\tNumeration", "1\titem\t6\tenabled\tRenumber static.ini",
-                 "1\titem\t7\tenabled\tDenumber static.ini", "0\tsub\t0\tenabled\tCreate",
-                 "1\titem\t8\tenabled\t.. objects list for FMB", "1\titem\t9\tenabled\t.. objects list for FMB+",
-                 "0\tsub\t0\tenabled\tPath", "1\titem\t11\tenabled\tSave path to static.ini/maps folder",
-                 "1\titem\t12\tenabled\tClear path to static.ini/maps folder", "0\tsub\t0\tenabled\t?",
+                {"0\tsub\t0\tenabled\tFile",
+                 "1\titem\t1\tenabled\tClose",
+                 "0\tsub\t0\tenabled\tSearch",
+                 "1\titem\t2\tenabled\t.. missing objects",
+                 "1\titem\t3\tenabled\t.. doubled objects",
+                 "1\titem\t4\tenabled\t.. irregular entrys",
+                 "1\tseparator",
+                 "1\tsub\t0\tenabled\t.. reference stuff",
+                 "2\titem\t5\tenabled\t.. wrong sim references",
+                 "2\titem\t14\tenabled\t.. doubled used sims",
+                 "2\titem\t15\tenabled\t.. empty references",
+                 "0\tsub\t0\tenabled\tNumeration",
+                 "1\titem\t6\tenabled\tRenumber static.ini",
+                 "1\titem\t7\tenabled\tDenumber static.ini",
+                 "0\tsub\t0\tenabled\tCreate",
+                 "1\titem\t8\tenabled\t.. objects list for FMB",
+                 "1\titem\t9\tenabled\t.. objects list for FMB+",
+                 "0\tsub\t0\tenabled\tPath",
+                 "1\titem\t11\tenabled\tSave path to static.ini/maps folder",
+                 "1\titem\t12\tenabled\tClear path to static.ini/maps folder",
+                 "0\tsub\t0\tenabled\t?",
                  "1\titem\t13\tenabled\t(credit)"},
                 "menu table");
     Screenshot("main-window");
@@ -253,15 +273,18 @@ void ChooseFolderAndSave() {
         std::size_t slash = rest.find('\\', start);
         OpenBrowserRow(program, chooser, rest.substr(start, slash - start), false);
         start = slash + 1;
-        Require(WaitForChooserPath(chooser, Work(rest.substr(0, start))), "the browser opens " + rest.substr(0, start));
+        Require(WaitForChooserPath(chooser, Work(rest.substr(0, start))),
+                "the browser opens " + rest.substr(0, start));
     }
     SelectBrowserRow(program, chooser, "static.ini");
-    Expect(WaitForChooserPath(chooser, TreeCatalogue() + "static.ini"), "a selected file is shown after its folder");
+    Expect(WaitForChooserPath(chooser, TreeCatalogue() + "static.ini"),
+           "a selected file is shown after its folder");
     ClickButton(Control(chooser, "Button"));
     ConfirmMessage(program, "Path saved", "Path saved in verrant.ini");
     Expect(WaitUntilGone(chooser), "the chooser closes once a folder is taken");
     std::string saved;
-    Expect(ReadBytes(Work("start\\choose\\verrant.ini"), saved), "verrant.ini is written in the start folder");
+    Expect(ReadBytes(Work("start\\choose\\verrant.ini"), saved),
+           "verrant.ini is written in the start folder");
     ExpectText(saved, TreeCatalogue(), "verrant.ini holds the folder alone, with no line end");
 
     PressCloseBox(program.main);
@@ -315,11 +338,13 @@ void DoubledObjectsWithProgressList() {
     Expect(SendMessageA(toggle, BM_GETCHECK, 0, 0) == BST_CHECKED, "the toggle stays down");
     ExpectFrame(progress, 650, 320, 370, 470, "progress list window");
     ExpectStyle(progress, false, false, "progress list window");
-    Expect((GetClassLongA(progress, GCL_STYLE) & CS_NOCLOSE) != 0, "Alt+F4 cannot close the progress list window");
+    Expect((GetClassLongA(progress, GCL_STYLE) & CS_NOCLOSE) != 0,
+           "Alt+F4 cannot close the progress list window");
     HWND list = ProgressList(progress);
     ExpectPlace(list, 10, 20, 350, 430, "progress list");
     LONG style = GetWindowLongA(list, GWL_STYLE);
-    Expect((style & LBS_NOINTEGRALHEIGHT) && !(style & LBS_SORT), "the list keeps its height and never sorts");
+    Expect((style & LBS_NOINTEGRALHEIGHT) && !(style & LBS_SORT),
+           "the list keeps its height and never sorts");
     Expect((GetWindowLongA(list, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) != 0, "the list is sunken");
 
     ChooseMenuItem(program, 3);
@@ -328,9 +353,14 @@ void DoubledObjectsWithProgressList() {
     Strings names = TreeNames();
     Strings expected;
     for (int i = 0; i < static_cast<int>(names.size()); ++i) {
-        expected.push_back("Build (" + std::to_string(i) + ") buildings.House$" + names[static_cast<std::size_t>(i)]);
-        if (i == 5) expected.insert(expected.end(), {Ruler, "Double object (5) => (17): buildings.House$Dup1", Ruler});
-        if (i == 20) expected.insert(expected.end(), {Ruler, "Double object (20) => (33): buildings.House$Dup2", Ruler});
+        expected.push_back("Build (" + std::to_string(i) + ") buildings.House$" +
+                           names[static_cast<std::size_t>(i)]);
+        if (i == 5)
+            expected.insert(expected.end(),
+                            {Ruler, "Double object (5) => (17): buildings.House$Dup1", Ruler});
+        if (i == 20)
+            expected.insert(expected.end(),
+                            {Ruler, "Double object (20) => (33): buildings.House$Dup2", Ruler});
     }
     expected.insert(expected.end(), {"", "Total number of objects: 40"});
     ExpectLines(ListLines(list), expected, "progress list lines");
@@ -339,10 +369,11 @@ void DoubledObjectsWithProgressList() {
     Expect((GetWindowLongA(list, GWL_STYLE) & WS_VSCROLL) != 0, "the list has a vertical scroll bar");
     std::string bytes;
     Expect(ReadBytes(report, bytes), "Doubled_objects.txt is on the desktop");
-    ExpectText(bytes,
-               "Doubled objects in your static.ini:\r\n\r\nDouble object (5) => (17): buildings.House$Dup1\r\n"
-               "Double object (20) => (33): buildings.House$Dup2\r\n",
-               "Doubled_objects.txt");
+    ExpectText(
+        bytes,
+        "Doubled objects in your static.ini:\r\n\r\nDouble object (5) => (17): buildings.House$Dup1\r\n"
+        "Double object (20) => (33): buildings.House$Dup2\r\n",
+        "Doubled_objects.txt");
     SetForegroundWindow(progress);
     Screenshot("progress-list");
     EndProcessesWithWindow("Doubled_objects", program.process.dwProcessId);
@@ -375,8 +406,8 @@ void NoFindingsDisablesProgressList() {
     Expect(IsWindowEnabled(progress) == FALSE, "the progress list is disabled while the box is shown");
     Expect(IsWindowEnabled(program.main) == FALSE, "the main window is disabled while the box is shown");
     ExpectLines(ListLines(ProgressList(progress)),
-                {"Build (0) buildings.House$A", "Build (1) buildings.House$a", "Build (2) buildings.House$B", "",
-                 "Total number of objects: 3"},
+                {"Build (0) buildings.House$A", "Build (1) buildings.House$a", "Build (2) buildings.House$B",
+                 "", "Total number of objects: 3"},
                 "progress lines without findings");
     DismissMessageBox(seen);
     Pause(200);
@@ -393,14 +424,16 @@ void ProgramFileResources() {
     DWORD size = GetFileVersionInfoSizeA(Settings.program.c_str(), &ignored);
     Require(size > 0, "verrant.exe has a version resource");
     std::string data(size, '\0');
-    Require(GetFileVersionInfoA(Settings.program.c_str(), 0, size, data.data()) != FALSE, "the version resource reads");
+    Require(GetFileVersionInfoA(Settings.program.c_str(), 0, size, data.data()) != FALSE,
+            "the version resource reads");
     char* product = nullptr;
     UINT length = 0;
-    Expect(VerQueryValueA(data.data(), "\\StringFileInfo\\040904B0\\ProductName", reinterpret_cast<void**>(&product),
-                          &length) &&
+    Expect(VerQueryValueA(data.data(), "\\StringFileInfo\\040904B0\\ProductName",
+                          reinterpret_cast<void**>(&product), &length) &&
                std::string(product) == "Verrant",
            "the product name is Verrant");
-    Expect(ExtractIconExA(Settings.program.c_str(), -1, nullptr, nullptr, 0) >= 1, "verrant.exe carries an icon");
+    Expect(ExtractIconExA(Settings.program.c_str(), -1, nullptr, nullptr, 0) >= 1,
+           "verrant.exe carries an icon");
 }
 
 struct Scenario {
@@ -429,7 +462,8 @@ int main(int argc, char** argv) {
         {"program file: version resource and icon", ProgramFileResources},
         {"first start: question, chooser, closing it; main window, buttons, menu table; Close",
          FirstStartAndMainWindow},
-        {"chooser: wrong folder, then a folder with static.ini; settings file bytes; close box", ChooseFolderAndSave},
+        {"chooser: wrong folder, then a folder with static.ini; settings file bytes; close box",
+         ChooseFolderAndSave},
         {"settings file naming a folder without static.ini", SettingsFolderLost},
         {"Clear path twice; a command without a folder", ClearPathTwice},
         {"doubled objects: progress list lines, report on the desktop, Notepad; toggle off and on",
@@ -460,8 +494,10 @@ int main(int argc, char** argv) {
     }
     if (!StartTimes.empty()) {
         std::sort(StartTimes.begin(), StartTimes.end());
-        std::printf("start-up to a visible main window: fastest %.0f ms, median %.0f ms, slowest %.0f ms (%zu starts)\n",
-                    StartTimes.front(), StartTimes[StartTimes.size() / 2], StartTimes.back(), StartTimes.size());
+        std::printf(
+            "start-up to a visible main window: fastest %.0f ms, median %.0f ms, slowest %.0f ms (%zu "
+            "starts)\n",
+            StartTimes.front(), StartTimes[StartTimes.size() / 2], StartTimes.back(), StartTimes.size());
     }
     std::printf("%d passed, %d failed\n", passed, failed);
     return failed == 0 ? 0 : 1;

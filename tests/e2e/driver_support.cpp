@@ -20,9 +20,11 @@ double Now() {
 
 std::string Narrow(const std::wstring& wide) {
     if (wide.empty()) return "";
-    int size = WideCharToMultiByte(CP_ACP, 0, wide.data(), static_cast<int>(wide.size()), nullptr, 0, nullptr, nullptr);
+    int size = WideCharToMultiByte(CP_ACP, 0, wide.data(), static_cast<int>(wide.size()), nullptr, 0, nullptr,
+                                   nullptr);
     std::string text(static_cast<std::size_t>(size), '\0');
-    WideCharToMultiByte(CP_ACP, 0, wide.data(), static_cast<int>(wide.size()), text.data(), size, nullptr, nullptr);
+    WideCharToMultiByte(CP_ACP, 0, wide.data(), static_cast<int>(wide.size()), text.data(), size, nullptr,
+                        nullptr);
     return text;
 }
 
@@ -124,8 +126,8 @@ Program StartProgram(const std::string& startFolder) {
     STARTUPINFOA startup = {};
     startup.cb = sizeof startup;
     double started = Now();
-    Require(CreateProcessA(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, startFolder.c_str(), &startup,
-                           &program.process),
+    Require(CreateProcessA(nullptr, line.data(), nullptr, nullptr, FALSE, 0, nullptr, startFolder.c_str(),
+                           &startup, &program.process),
             "verrant.exe starts");
     for (double waited = 0; waited < 10000; waited = Now() - started) {
         program.main = FindWindowOf(program.process.dwProcessId, "Verrant V.1.3", nullptr);
@@ -148,7 +150,8 @@ Program StartProgram(const std::string& startFolder) {
 
 long WaitForExit(Program& program, int milliseconds) {
     if (program.process.hProcess == nullptr) return -1;
-    if (WaitForSingleObject(program.process.hProcess, static_cast<DWORD>(milliseconds)) != WAIT_OBJECT_0) return -1;
+    if (WaitForSingleObject(program.process.hProcess, static_cast<DWORD>(milliseconds)) != WAIT_OBJECT_0)
+        return -1;
     DWORD code = 0;
     GetExitCodeProcess(program.process.hProcess, &code);
     return static_cast<long>(code);
@@ -175,8 +178,8 @@ std::string WindowText(HWND window) {
     if (!SendMessageTimeoutW(window, WM_GETTEXTLENGTH, 0, 0, SMTO_ABORTIFHUNG, 2000, &length)) return "";
     std::wstring text(length + 1, L'\0');
     DWORD_PTR copied = 0;
-    SendMessageTimeoutW(window, WM_GETTEXT, length + 1, reinterpret_cast<LPARAM>(text.data()), SMTO_ABORTIFHUNG, 2000,
-                        &copied);
+    SendMessageTimeoutW(window, WM_GETTEXT, length + 1, reinterpret_cast<LPARAM>(text.data()),
+                        SMTO_ABORTIFHUNG, 2000, &copied);
     text.resize(copied);
     return Narrow(text);
 }
@@ -235,7 +238,8 @@ MessageBoxSeen WaitForMessageBox(const Program& program, int milliseconds) {
     seen.title = WindowText(seen.box);
     seen.text = WindowText(GetDlgItem(seen.box, 0xFFFF));
     // The icon static is there even when the box has no icon; what counts is whether it holds one.
-    for (HWND child = GetWindow(seen.box, GW_CHILD); child != nullptr; child = GetWindow(child, GW_HWNDNEXT)) {
+    for (HWND child = GetWindow(seen.box, GW_CHILD); child != nullptr;
+         child = GetWindow(child, GW_HWNDNEXT)) {
         DWORD_PTR icon = 0;
         SendMessageTimeoutW(child, STM_GETICON, 0, 0, SMTO_ABORTIFHUNG, 2000, &icon);
         if (icon != 0) seen.hasIcon = true;
@@ -272,8 +276,8 @@ Strings ListLines(HWND list) {
         SendMessageTimeoutW(list, LB_GETTEXTLEN, i, 0, SMTO_ABORTIFHUNG, 2000, &length);
         std::wstring text(length + 1, L'\0');
         DWORD_PTR copied = 0;
-        SendMessageTimeoutW(list, LB_GETTEXT, i, reinterpret_cast<LPARAM>(text.data()), SMTO_ABORTIFHUNG, 2000,
-                            &copied);
+        SendMessageTimeoutW(list, LB_GETTEXT, i, reinterpret_cast<LPARAM>(text.data()), SMTO_ABORTIFHUNG,
+                            2000, &copied);
         text.resize(std::min<DWORD_PTR>(copied, length));
         lines.push_back(Narrow(text));
     }
@@ -282,7 +286,9 @@ Strings ListLines(HWND list) {
 
 void ClickButton(HWND button) { PostMessageA(button, BM_CLICK, 0, 0); }
 
-void ChooseMenuItem(const Program& program, int id) { PostMessageA(program.main, WM_COMMAND, static_cast<WPARAM>(id), 0); }
+void ChooseMenuItem(const Program& program, int id) {
+    PostMessageA(program.main, WM_COMMAND, static_cast<WPARAM>(id), 0);
+}
 
 void PressCloseBox(HWND window) { PostMessageA(window, WM_SYSCOMMAND, SC_CLOSE, 0); }
 
@@ -362,7 +368,8 @@ void Screenshot(const std::string& name) {
     Sleep(300);  // let every window finish painting
     std::string request = Settings.shotsFolder + name + ".request";
     WriteBytes(request, name);
-    for (int waited = 0; FileExists(request) && waited < 15000; waited += PollMilliseconds) Sleep(PollMilliseconds);
+    for (int waited = 0; FileExists(request) && waited < 15000; waited += PollMilliseconds)
+        Sleep(PollMilliseconds);
 }
 
 //--- files
@@ -380,7 +387,8 @@ std::string DesktopFolder() {
 }
 
 void WriteBytes(const std::string& path, const std::string& bytes) {
-    HANDLE file = CreateFileA(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file =
+        CreateFileA(path.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
     Require(file != INVALID_HANDLE_VALUE, "can write " + path);
     DWORD written = 0;
     WriteFile(file, bytes.data(), static_cast<DWORD>(bytes.size()), &written, nullptr);
@@ -388,8 +396,9 @@ void WriteBytes(const std::string& path, const std::string& bytes) {
 }
 
 bool ReadBytes(const std::string& path, std::string& bytes) {
-    HANDLE file = CreateFileA(path.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-                              nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file =
+        CreateFileA(path.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                    nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) return false;
     bytes.clear();
     char buffer[4096];
@@ -399,10 +408,13 @@ bool ReadBytes(const std::string& path, std::string& bytes) {
     return true;
 }
 
-bool FileExists(const std::string& path) { return GetFileAttributesA(path.c_str()) != INVALID_FILE_ATTRIBUTES; }
+bool FileExists(const std::string& path) {
+    return GetFileAttributesA(path.c_str()) != INVALID_FILE_ATTRIBUTES;
+}
 
 void MakeFolders(const std::string& folder) {
-    for (std::size_t slash = folder.find('\\', 3); slash != std::string::npos; slash = folder.find('\\', slash + 1))
+    for (std::size_t slash = folder.find('\\', 3); slash != std::string::npos;
+         slash = folder.find('\\', slash + 1))
         CreateDirectoryA(folder.substr(0, slash).c_str(), nullptr);
     CreateDirectoryA(folder.c_str(), nullptr);
 }

@@ -24,7 +24,7 @@ void ExpectText(const std::string& actual, const std::string& expected, const st
 void ExpectLines(const Strings& actual, const Strings& expected, const std::string& what);
 
 struct DriverSettings {
-    std::string program;      // verrant.exe
+    std::string program;       // verrant.exe
     std::string probeLibrary;  // the probe DLL
     std::string workRoot;      // fixtures and start folders, ending in "\"
     std::string shotsFolder;   // "" for no screenshots

@@ -2,8 +2,8 @@
 // It answers the driver's requests from inside the program and swallows them.
 #include "probe.h"
 
-#include <windows.h>
 #include <commctrl.h>
+#include <windows.h>
 
 #include <string>
 
@@ -16,7 +16,8 @@ void Answer(const std::string& text) {
     if (!GetEnvironmentVariableA(PROBE_FILE_VARIABLE, path, sizeof path)) return;
     // Written aside and renamed, so the driver never reads half an answer.
     std::string partial = std::string(path) + ".part";
-    HANDLE file = CreateFileA(partial.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file = CreateFileA(partial.c_str(), GENERIC_WRITE, 0, nullptr, CREATE_ALWAYS,
+                              FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) return;
     DWORD written = 0;
     WriteFile(file, text.data(), static_cast<DWORD>(text.size()), &written, nullptr);
@@ -35,9 +36,11 @@ void DescribeMenu(HMENU menu, int depth, std::string& out) {
         item.cch = sizeof text;
         if (!GetMenuItemInfoA(menu, static_cast<UINT>(i), TRUE, &item)) continue;
         const char* kind = (item.fType & MFT_SEPARATOR) ? "separator" : item.hSubMenu ? "sub" : "item";
-        const char* state = (item.fState & MFS_DISABLED) ? "disabled" : (item.fState & MFS_CHECKED) ? "checked" : "enabled";
-        out += Number(depth) + "\t" + kind + "\t" + Number(item.hSubMenu ? 0 : item.wID) + "\t" + state + "\t" + text +
-               "\n";
+        const char* state = (item.fState & MFS_DISABLED)  ? "disabled"
+                            : (item.fState & MFS_CHECKED) ? "checked"
+                                                          : "enabled";
+        out += Number(depth) + "\t" + kind + "\t" + Number(item.hSubMenu ? 0 : item.wID) + "\t" + state +
+               "\t" + text + "\n";
         if (item.hSubMenu) DescribeMenu(item.hSubMenu, depth + 1, out);
     }
 }
@@ -84,7 +87,8 @@ std::string RowsAnswer(HWND window) {
     int rows = static_cast<int>(SendMessageA(list, LVM_GETITEMCOUNT, 0, 0));
     for (int r = 0; r < rows; ++r) {
         bool selected = SendMessageA(list, LVM_GETITEMSTATE, static_cast<WPARAM>(r), LVIS_SELECTED) != 0;
-        out += std::string(selected ? "*" : "-") + "\t" + CellText(list, r, 0) + "\t" + CellText(list, r, 1) + "\n";
+        out += std::string(selected ? "*" : "-") + "\t" + CellText(list, r, 0) + "\t" + CellText(list, r, 1) +
+               "\n";
     }
     return out;
 }
@@ -138,12 +142,18 @@ std::string CaptionsAnswer(HWND window) {
 
 std::string AnswerFor(HWND window, WPARAM request, LPARAM row) {
     switch (request) {
-    case ProbeMenu: return MenuAnswer(window);
-    case ProbeRows: return RowsAnswer(window);
-    case ProbeSelectRow: return SelectAnswer(window, static_cast<int>(row));
-    case ProbeRowPoint: return PointAnswer(window, static_cast<int>(row));
-    case ProbeCaptions: return CaptionsAnswer(window);
-    default: return "unknown request\n";
+        case ProbeMenu:
+            return MenuAnswer(window);
+        case ProbeRows:
+            return RowsAnswer(window);
+        case ProbeSelectRow:
+            return SelectAnswer(window, static_cast<int>(row));
+        case ProbeRowPoint:
+            return PointAnswer(window, static_cast<int>(row));
+        case ProbeCaptions:
+            return CaptionsAnswer(window);
+        default:
+            return "unknown request\n";
     }
 }
 

@@ -26,10 +26,10 @@ struct BrowserEntry {
 struct FileBrowser {
     HWND list = nullptr;
     int id = 0;
-    std::string folder;   // ends in "\"; "" at the top level
-    std::string pattern;  // for the files shown
+    std::string folder;                 // ends in "\"; "" at the top level
+    std::string pattern;                // for the files shown
     std::vector<BrowserEntry> entries;  // in the order of the rows
-    bool filling = false;  // rows change while filling: no events then
+    bool filling = false;               // rows change while filling: no events then
 };
 
 std::map<HWND, FileBrowser> Browsers;  // by list view
@@ -70,7 +70,8 @@ ShellLook LookOf(const std::string& name, bool isFolder) {
     if (it != known.end()) return it->second;
     SHFILEINFOA information = {};
     SHGetFileInfoA(isFolder ? "folder" : ("file" + key).c_str(),
-                   isFolder ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL, &information, sizeof information,
+                   isFolder ? FILE_ATTRIBUTE_DIRECTORY : FILE_ATTRIBUTE_NORMAL, &information,
+                   sizeof information,
                    SHGFI_USEFILEATTRIBUTES | SHGFI_SYSICONINDEX | SHGFI_SMALLICON | SHGFI_TYPENAME);
     ShellLook look{information.iIcon, information.szTypeName};
     if (look.type.empty()) look.type = isFolder ? "Folder" : "File";
@@ -80,11 +81,16 @@ ShellLook LookOf(const std::string& name, bool isFolder) {
 
 std::string DriveType(const std::string& root) {
     switch (GetDriveTypeA(root.c_str())) {
-    case DRIVE_REMOVABLE: return "Removable disk";
-    case DRIVE_REMOTE: return "Network drive";
-    case DRIVE_CDROM: return "CD drive";
-    case DRIVE_RAMDISK: return "RAM disk";
-    default: return "Local disk";
+        case DRIVE_REMOVABLE:
+            return "Removable disk";
+        case DRIVE_REMOTE:
+            return "Network drive";
+        case DRIVE_CDROM:
+            return "CD drive";
+        case DRIVE_RAMDISK:
+            return "RAM disk";
+        default:
+            return "Local disk";
     }
 }
 
@@ -133,7 +139,9 @@ std::vector<BrowserEntry> TopLevelEntries() {
     return entries;
 }
 
-bool ByName(const BrowserEntry& a, const BrowserEntry& b) { return lstrcmpiA(a.name.c_str(), b.name.c_str()) < 0; }
+bool ByName(const BrowserEntry& a, const BrowserEntry& b) {
+    return lstrcmpiA(a.name.c_str(), b.name.c_str()) < 0;
+}
 
 // Hidden entries stay out of sight, as in the shell; a folder that cannot be listed (a drive that is
 // not ready) shows its parent entry alone.
@@ -146,7 +154,8 @@ void AddListedEntries(const std::string& pattern, bool folders, std::vector<Brow
     do {
         std::string name = found.cFileName;
         bool isFolder = (found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
-        if (isFolder != folders || name == "." || name == ".." || (found.dwFileAttributes & FILE_ATTRIBUTE_HIDDEN))
+        if (isFolder != folders || name == "." || name == ".." ||
+            (found.dwFileAttributes & FILE_ATTRIBUTE_HIDDEN))
             continue;
         BrowserEntry entry;
         entry.name = name;
@@ -213,7 +222,8 @@ void ShowFolder(FileBrowser& browser, const std::string& folder) {
 }
 
 int SelectedRow(const FileBrowser& browser) {
-    int row = static_cast<int>(SendMessageA(browser.list, LVM_GETNEXTITEM, static_cast<WPARAM>(-1), LVNI_SELECTED));
+    int row =
+        static_cast<int>(SendMessageA(browser.list, LVM_GETNEXTITEM, static_cast<WPARAM>(-1), LVNI_SELECTED));
     return row >= 0 && static_cast<std::size_t>(row) < browser.entries.size() ? row : -1;
 }
 
@@ -227,24 +237,25 @@ void OpenRow(FileBrowser& browser, int row) {
 // Whether a notification is one the program hears of; opening entries happens here too.
 bool TakeNotification(FileBrowser& browser, const NMHDR& header) {
     switch (header.code) {
-    case LVN_ITEMCHANGED: {
-        const auto& change = reinterpret_cast<const NMLISTVIEW&>(header);
-        return (change.uChanged & LVIF_STATE) && ((change.uOldState ^ change.uNewState) & LVIS_SELECTED);
-    }
-    case NM_CLICK:
-        return true;
-    case NM_DBLCLK:
-        OpenRow(browser, reinterpret_cast<const NMITEMACTIVATE&>(header).iItem);
-        return true;
-    case NM_RETURN:
-        OpenRow(browser, SelectedRow(browser));
-        return true;
-    case LVN_KEYDOWN:
-        if (reinterpret_cast<const NMLVKEYDOWN&>(header).wVKey != VK_BACK || browser.folder.empty()) return false;
-        ShowFolder(browser, ParentFolder(browser.folder));
-        return true;
-    default:
-        return false;
+        case LVN_ITEMCHANGED: {
+            const auto& change = reinterpret_cast<const NMLISTVIEW&>(header);
+            return (change.uChanged & LVIF_STATE) && ((change.uOldState ^ change.uNewState) & LVIS_SELECTED);
+        }
+        case NM_CLICK:
+            return true;
+        case NM_DBLCLK:
+            OpenRow(browser, reinterpret_cast<const NMITEMACTIVATE&>(header).iItem);
+            return true;
+        case NM_RETURN:
+            OpenRow(browser, SelectedRow(browser));
+            return true;
+        case LVN_KEYDOWN:
+            if (reinterpret_cast<const NMLVKEYDOWN&>(header).wVKey != VK_BACK || browser.folder.empty())
+                return false;
+            ShowFolder(browser, ParentFolder(browser.folder));
+            return true;
+        default:
+            return false;
     }
 }
 
@@ -261,15 +272,16 @@ void AddColumn(HWND list, int index, const char* title, int width) {
 
 Handle AddFileBrowser(Handle window, int left, int top, int width, int height, int id,
                       const std::string& pathWithPattern) {
-    HWND list = AddChildWindow(window, WC_LISTVIEWA, "",
-                               WS_TABSTOP | LVS_REPORT | LVS_SINGLESEL | LVS_SHOWSELALWAYS | LVS_SHAREIMAGELISTS,
-                               WS_EX_CLIENTEDGE, left, top, width, height, id);
+    HWND list =
+        AddChildWindow(window, WC_LISTVIEWA, "",
+                       WS_TABSTOP | LVS_REPORT | LVS_SINGLESEL | LVS_SHOWSELALWAYS | LVS_SHAREIMAGELISTS,
+                       WS_EX_CLIENTEDGE, left, top, width, height, id);
     if (list == nullptr) return 0;
     SendMessageA(list, LVM_SETEXTENDEDLISTVIEWSTYLE, 0, LVS_EX_FULLROWSELECT | LVS_EX_DOUBLEBUFFER);
     SHFILEINFOA information = {};
-    auto images = reinterpret_cast<HIMAGELIST>(SHGetFileInfoA(
-        "file", FILE_ATTRIBUTE_NORMAL, &information, sizeof information,
-        SHGFI_USEFILEATTRIBUTES | SHGFI_SYSICONINDEX | SHGFI_SMALLICON));
+    auto images = reinterpret_cast<HIMAGELIST>(
+        SHGetFileInfoA("file", FILE_ATTRIBUTE_NORMAL, &information, sizeof information,
+                       SHGFI_USEFILEATTRIBUTES | SHGFI_SYSICONINDEX | SHGFI_SMALLICON));
     SendMessageA(list, LVM_SETIMAGELIST, LVSIL_SMALL, reinterpret_cast<LPARAM>(images));
     AddColumn(list, 0, "Name", NameColumnWidth);
     AddColumn(list, 1, "Type", TypeColumnWidth);

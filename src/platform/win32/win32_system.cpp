@@ -69,7 +69,8 @@ bool StartProcess(const std::string& commandLine, const std::string& workingFold
     return true;
 }
 
-bool ShellExecuteOpen(const std::string& file, const std::string& parameters, const std::string& workingFolder) {
+bool ShellExecuteOpen(const std::string& file, const std::string& parameters,
+                      const std::string& workingFolder) {
     HINSTANCE result = ShellExecuteA(nullptr, "open", file.c_str(), parameters.c_str(),
                                      workingFolder.empty() ? nullptr : workingFolder.c_str(), SW_SHOWNORMAL);
     return reinterpret_cast<INT_PTR>(result) > 32;
@@ -94,8 +95,8 @@ std::string CurrentFolder() {
 }
 
 Handle OpenForReading(const std::string& name) {
-    HANDLE file = CreateFileA(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr, OPEN_EXISTING,
-                              FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file = CreateFileA(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE, nullptr,
+                              OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) return 0;
     BY_HANDLE_FILE_INFORMATION information;
     if (!GetFileInformationByHandle(file, &information) ||
@@ -125,7 +126,8 @@ bool WriteBytes(Handle file, const char* data, std::size_t size) {
     std::size_t total = 0;
     while (total < size) {
         DWORD done = 0;
-        if (!WriteFile(ToFile(file), data + total, Chunk(size - total), &done, nullptr) || done == 0) return false;
+        if (!WriteFile(ToFile(file), data + total, Chunk(size - total), &done, nullptr) || done == 0)
+            return false;
         total += done;
     }
     return true;
@@ -138,14 +140,16 @@ bool CloseFile(Handle file) { return file != 0 && CloseHandle(ToFile(file)); }
 bool RemoveFile(const std::string& name) { return DeleteFileA(name.c_str()) != FALSE; }
 
 bool ReplaceFileWith(const std::string& target, const std::string& source) {
-    return MoveFileExA(source.c_str(), target.c_str(), MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE;
+    return MoveFileExA(source.c_str(), target.c_str(), MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) !=
+           FALSE;
 }
 
 bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
     entries.clear();
     WIN32_FIND_DATAA found;
     HANDLE search = FindFirstFileA(pattern.c_str(), &found);
-    if (search == INVALID_HANDLE_VALUE) return GetLastError() == ERROR_FILE_NOT_FOUND;  // a folder with no match
+    if (search == INVALID_HANDLE_VALUE)
+        return GetLastError() == ERROR_FILE_NOT_FOUND;  // a folder with no match
     do {
         FolderEntry entry;
         entry.name = found.cFileName;

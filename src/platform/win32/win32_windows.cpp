@@ -43,21 +43,21 @@ void QueueCommand(HWND window, WPARAM wParam, LPARAM lParam) {
 
 LRESULT CALLBACK TopWindowProcedure(HWND window, UINT message, WPARAM wParam, LPARAM lParam) {
     switch (message) {
-    case WM_COMMAND:
-        QueueCommand(window, wParam, lParam);
-        return 0;
-    case WM_NOTIFY:
-        NotifyFileBrowser(window, *reinterpret_cast<const NMHDR*>(lParam));
-        return 0;
-    case WM_CLOSE: {
-        Event event;
-        event.window = ToHandle(window);
-        event.kind = EventKind::CloseRequest;
-        EnqueueEvent(event);
-        return 0;
-    }
-    default:
-        return DefWindowProcA(window, message, wParam, lParam);
+        case WM_COMMAND:
+            QueueCommand(window, wParam, lParam);
+            return 0;
+        case WM_NOTIFY:
+            NotifyFileBrowser(window, *reinterpret_cast<const NMHDR*>(lParam));
+            return 0;
+        case WM_CLOSE: {
+            Event event;
+            event.window = ToHandle(window);
+            event.kind = EventKind::CloseRequest;
+            EnqueueEvent(event);
+            return 0;
+        }
+        default:
+            return DefWindowProcA(window, message, wParam, lParam);
     }
 }
 
@@ -112,10 +112,10 @@ HFONT GuiFont() {
 
 HWND AddChildWindow(Handle window, const char* windowClass, const std::string& text, DWORD style,
                     DWORD extendedStyle, int left, int top, int width, int height, int id) {
-    HWND control = CreateWindowExA(extendedStyle, windowClass, text.c_str(), WS_CHILD | WS_VISIBLE | style, left,
-                                   top, width, height, ToWindow(window),
-                                   reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)), GetModuleHandleA(nullptr),
-                                   nullptr);
+    HWND control =
+        CreateWindowExA(extendedStyle, windowClass, text.c_str(), WS_CHILD | WS_VISIBLE | style, left, top,
+                        width, height, ToWindow(window), reinterpret_cast<HMENU>(static_cast<INT_PTR>(id)),
+                        GetModuleHandleA(nullptr), nullptr);
     if (control != nullptr) SendMessageA(control, WM_SETFONT, reinterpret_cast<WPARAM>(GuiFont()), TRUE);
     return control;
 }
@@ -145,9 +145,9 @@ Handle OpenTopWindow(const std::string& title, int left, int top, int clientWidt
     // The menu bar comes later and takes its height out of the client area.
     RECT outer = {0, 0, clientWidth, clientHeight};
     AdjustWindowRectEx(&outer, style, FALSE, 0);
-    HWND window = CreateWindowExA(0, frame.systemMenu ? TopWindowClass : FixedWindowClass, title.c_str(), style,
-                                  left, top, outer.right - outer.left, outer.bottom - outer.top, nullptr, nullptr,
-                                  GetModuleHandleA(nullptr), nullptr);
+    HWND window = CreateWindowExA(0, frame.systemMenu ? TopWindowClass : FixedWindowClass, title.c_str(),
+                                  style, left, top, outer.right - outer.left, outer.bottom - outer.top,
+                                  nullptr, nullptr, GetModuleHandleA(nullptr), nullptr);
     if (window == nullptr) return 0;
     ShowWindow(window, SW_SHOW);
     UpdateWindow(window);
@@ -167,29 +167,34 @@ void ActivateTopWindow(Handle window) { SetForegroundWindow(ToWindow(window)); }
 
 //--- buttons, label, text box
 
-Handle AddPushButton(Handle window, const std::string& text, int left, int top, int width, int height, int id) {
+Handle AddPushButton(Handle window, const std::string& text, int left, int top, int width, int height,
+                     int id) {
     return ToHandle(
         AddChildWindow(window, "BUTTON", text, WS_TABSTOP | BS_PUSHBUTTON, 0, left, top, width, height, id));
 }
 
-Handle AddToggleButton(Handle window, const std::string& text, int left, int top, int width, int height, int id) {
-    return ToHandle(AddChildWindow(window, "BUTTON", text, WS_TABSTOP | BS_AUTOCHECKBOX | BS_PUSHLIKE, 0, left, top,
-                                   width, height, id));
+Handle AddToggleButton(Handle window, const std::string& text, int left, int top, int width, int height,
+                       int id) {
+    return ToHandle(AddChildWindow(window, "BUTTON", text, WS_TABSTOP | BS_AUTOCHECKBOX | BS_PUSHLIKE, 0,
+                                   left, top, width, height, id));
 }
 
 bool IsToggleDown(Handle toggle) { return SendMessageA(ToWindow(toggle), BM_GETCHECK, 0, 0) == BST_CHECKED; }
 
 Handle AddLabel(Handle window, const std::string& text, int left, int top, int width, int height) {
-    return ToHandle(AddChildWindow(window, "STATIC", text, SS_LEFT | SS_NOPREFIX, 0, left, top, width, height, 0));
+    return ToHandle(
+        AddChildWindow(window, "STATIC", text, SS_LEFT | SS_NOPREFIX, 0, left, top, width, height, 0));
 }
 
 // Read-only rather than a static, so a long path can be scrolled and copied.
 Handle AddTextBox(Handle window, int left, int top, int width, int height) {
-    return ToHandle(AddChildWindow(window, "EDIT", "", ES_READONLY | ES_AUTOHSCROLL, WS_EX_CLIENTEDGE, left, top,
-                                   width, height, 0));
+    return ToHandle(AddChildWindow(window, "EDIT", "", ES_READONLY | ES_AUTOHSCROLL, WS_EX_CLIENTEDGE, left,
+                                   top, width, height, 0));
 }
 
-void SetControlText(Handle control, const std::string& text) { SetWindowTextA(ToWindow(control), text.c_str()); }
+void SetControlText(Handle control, const std::string& text) {
+    SetWindowTextA(ToWindow(control), text.c_str());
+}
 
 std::string ControlText(Handle control) {
     int length = GetWindowTextLengthA(ToWindow(control));
@@ -202,8 +207,8 @@ std::string ControlText(Handle control) {
 //--- single-column list
 
 Handle AddListControl(Handle window, int left, int top, int width, int height, int id) {
-    return ToHandle(AddChildWindow(window, "LISTBOX", "", WS_VSCROLL | LBS_NOINTEGRALHEIGHT, WS_EX_CLIENTEDGE, left,
-                                   top, width, height, id));
+    return ToHandle(AddChildWindow(window, "LISTBOX", "", WS_VSCROLL | LBS_NOINTEGRALHEIGHT, WS_EX_CLIENTEDGE,
+                                   left, top, width, height, id));
 }
 
 void ClearListControl(Handle list) { SendMessageA(ToWindow(list), LB_RESETCONTENT, 0, 0); }
@@ -235,10 +240,13 @@ void AppendMenuItem(Handle menu, const std::string& text, int id) {
     AppendMenuA(reinterpret_cast<HMENU>(menu), MF_STRING, static_cast<UINT_PTR>(id), text.c_str());
 }
 
-void AppendMenuSeparator(Handle menu) { AppendMenuA(reinterpret_cast<HMENU>(menu), MF_SEPARATOR, 0, nullptr); }
+void AppendMenuSeparator(Handle menu) {
+    AppendMenuA(reinterpret_cast<HMENU>(menu), MF_SEPARATOR, 0, nullptr);
+}
 
 void AppendSubMenu(Handle menu, const std::string& text, Handle subMenu) {
-    AppendMenuA(reinterpret_cast<HMENU>(menu), MF_STRING | MF_POPUP, static_cast<UINT_PTR>(subMenu), text.c_str());
+    AppendMenuA(reinterpret_cast<HMENU>(menu), MF_STRING | MF_POPUP, static_cast<UINT_PTR>(subMenu),
+                text.c_str());
 }
 
 bool AttachMenuBar(Handle window, Handle menuBar) {
