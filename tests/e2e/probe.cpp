@@ -2,8 +2,9 @@
 // It answers the driver's requests from inside the program and swallows them.
 #include "probe.h"
 
-#include <commctrl.h>
 #include <windows.h>
+
+#include <commctrl.h>
 
 #include <string>
 
