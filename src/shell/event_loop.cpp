@@ -3,6 +3,8 @@
 #include "checks/doubled_objects.h"
 #include "location/catalogue_folder.h"
 #include "location/settings.h"
+#include "rewrite/mission_builder_list.h"
+#include "rewrite/renumbering.h"
 #include "platform/platform.h"
 #include "shell/app_state.h"
 #include "shell/main_window.h"
@@ -22,16 +24,24 @@ void RunMenuCommand(int id) {
         case MenuClearPath:
             ClearPath();
             break;
+        case MenuRenumber:
+            if (EnsureCatalogueFolderKnown()) RenumberCatalogue(CatalogueFolder, "renumber");
+            break;
+        case MenuDenumber:
+            if (EnsureCatalogueFolderKnown()) RenumberCatalogue(CatalogueFolder, "denumber");
+            break;
+        case MenuListForFmb:
+            if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb");
+            break;
+        case MenuListForFmbPlus:
+            if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb+");
+            break;
         // Commands whose procedures come with their own units: one line each above when they land.
         case MenuMissingObjects:
         case MenuIrregularEntries:
         case MenuWrongSimReferences:
         case MenuDoubledUsedSims:
         case MenuEmptyReferences:
-        case MenuRenumber:
-        case MenuDenumber:
-        case MenuListForFmb:
-        case MenuListForFmbPlus:
             break;
         case MenuCredit:
             break;
