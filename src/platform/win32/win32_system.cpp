@@ -4,11 +4,15 @@
 #include <shellapi.h>
 #include <shlobj.h>
 
+#include <set>
+
 namespace {
 
 HANDLE ToFile(Handle file) { return reinterpret_cast<HANDLE>(file); }
 
 Handle FromFile(HANDLE file) { return file == INVALID_HANDLE_VALUE ? 0 : reinterpret_cast<Handle>(file); }
+
+std::set<Handle> FailedReads;  // open files a read failed on
 
 // ReadFile and WriteFile take 32-bit counts.
 DWORD Chunk(std::size_t size) { return size > 0x40000000u ? 0x40000000u : static_cast<DWORD>(size); }
@@ -113,10 +117,15 @@ Handle CreateForWriting(const std::string& name) {
 }
 
 std::size_t ReadBytes(Handle file, char* buffer, std::size_t size) {
+    if (ReadHasFailed(file)) return 0;
     std::size_t total = 0;
     while (total < size) {
         DWORD done = 0;
-        if (!ReadFile(ToFile(file), buffer + total, Chunk(size - total), &done, nullptr) || done == 0) break;
+        if (!ReadFile(ToFile(file), buffer + total, Chunk(size - total), &done, nullptr)) {
+            FailedReads.insert(file);
+            break;
+        }
+        if (done == 0) break;
         total += done;
     }
     return total;
@@ -135,7 +144,12 @@ bool WriteBytes(Handle file, const char* data, std::size_t size) {
 
 bool FlushToDisk(Handle file) { return FlushFileBuffers(ToFile(file)) != FALSE; }
 
-bool CloseFile(Handle file) { return file != 0 && CloseHandle(ToFile(file)); }
+bool ReadHasFailed(Handle file) { return FailedReads.count(file) != 0; }
+
+bool CloseFile(Handle file) {
+    FailedReads.erase(file);
+    return file != 0 && CloseHandle(ToFile(file));
+}
 
 bool RemoveFile(const std::string& name) { return DeleteFileA(name.c_str()) != FALSE; }
 
