@@ -5,6 +5,7 @@
 #include "checks/doubled_objects.h"
 #include "checks/empty_references.h"
 #include "checks/irregular_entries.h"
+#include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
 #include "platform/headless/headless.h"
 #include "rewrite/mission_builder_list.h"
@@ -48,6 +49,7 @@ const CliCommand Commands[] = {
      [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb"); }},
     {"fmb-plus-list", "object list for FMB+, with plates (Static_list_FMBplus.txt)",
      [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb+"); }},
+    {"missing-objects", "objects a map (--map FILE) places that the catalogue lacks", RunMissingObjectsCommand},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
@@ -58,6 +60,7 @@ void PrintHelp(std::FILE* to) {
                  "  --catalogue DIR   the folder that holds static.ini\n"
                  "  --report-dir DIR  where the report is written (default: the current folder)\n"
                  "  --progress        print the progress list's lines to standard output\n"
+                 "  --map FILE        missing-objects: the map file; without --catalogue, its tree's catalogue\n"
                  "commands:\n");
     for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
     std::fprintf(to, "exit status: 0 nothing found, catalogue rewritten or list written; 1 findings reported;\n"

@@ -10,7 +10,8 @@
 
 using Handle = std::uintptr_t;  // a window, control, menu or open file; 0 means none
 
-// Once at start: common controls (version 6, as the manifest asks) and COM single-threaded.
+// Once at start: common controls (version 6, as the manifest asks), COM single-threaded, and no
+// critical-error boxes (a drive that is not ready just fails).
 void InitPlatform();
 
 //--- windows

@@ -5,6 +5,7 @@
 #include "checks/irregular_entries.h"
 #include "location/catalogue_folder.h"
 #include "location/settings.h"
+#include "maps/missing_objects_window.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
 #include "platform/platform.h"
@@ -17,6 +18,9 @@ namespace {
 
 void RunMenuCommand(int id) {
     switch (id) {
+        case MenuMissingObjects:
+            ShowMissingObjectsWindow(MapsPattern);
+            break;
         case MenuDoubledObjects:
             FindDoubledObjects();
             break;
@@ -45,7 +49,6 @@ void RunMenuCommand(int id) {
             if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb+");
             break;
         // Commands whose procedures come with their own units: one line each above when they land.
-        case MenuMissingObjects:
         case MenuWrongSimReferences:
         case MenuDoubledUsedSims:
             break;

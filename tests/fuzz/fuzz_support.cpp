@@ -38,11 +38,6 @@ const std::string& ScratchFolder() {
     return folder;
 }
 
-const std::string& ScratchFolderHost() {
-    ScratchFolder();
-    return HostScratch;
-}
-
 void ResetForInput() {
     ScratchFolder();
     HeadlessReset();
@@ -56,6 +51,8 @@ void ResetForInput() {
 
 void WriteScratchFile(const std::string& name, const std::string& bytes) {
     ScratchFolder();
+    std::error_code error;
+    fs::create_directories(fs::path(HostScratch + "/" + name).parent_path(), error);
     std::ofstream(HostScratch + "/" + name, std::ios::binary | std::ios::trunc) << bytes;
 }
 
@@ -76,8 +73,8 @@ std::string BaselineOutput(const std::string& baseline, const std::string& repor
     fs::remove_all(HostScratch + "/baseline", error);
     fs::create_directories(HostScratch + "/baseline", error);
     bool rewrite = report == "@static.ini";
-    BaselineInput input{rewrite ? HostScratch + "/copy" : HostScratch, HostScratch + "/mods", HostScratch + "/map",
-                        HostScratch + "/baseline"};
+    BaselineInput input{rewrite ? HostScratch + "/copy" : HostScratch, HostScratch + "/mods",
+                        HostScratch + "/map/actors.static", HostScratch + "/baseline"};
     exists = false;
     if (!RunBaseline(baseline, input)) return "";
     return rewrite ? ReadScratchFile("copy/static.ini", exists) : ReadScratchFile("baseline/" + report, exists);

@@ -11,7 +11,6 @@
 
 // Program path of the scratch folder, ending in "\"; made at the first call, removed at exit.
 const std::string& ScratchFolder();
-const std::string& ScratchFolderHost();
 // Resets the headless platform and the application state; the desktop is the scratch folder's
 // Desktop, which is emptied.
 void ResetForInput();

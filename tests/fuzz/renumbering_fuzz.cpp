@@ -5,8 +5,6 @@
 
 #include "rewrite/renumbering.h"
 
-#include <filesystem>
-
 namespace {
 
 // "(", digits, ")" between blanks: the lines the denumbering takes out.
@@ -43,7 +41,6 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     WriteScratchFile("static.ini", input);
     std::string renumbered = Rewrite("renumber");
     if (onlyNumberLinesHoldBrackets) {
-        std::filesystem::create_directories(ScratchFolderHost() + "/copy");
         WriteScratchFile("copy/static.ini", input);
         bool exists = false;
         Require(renumbered == BaselineOutput("two-passes", "@static.ini", exists), "renumbering as the two passes");

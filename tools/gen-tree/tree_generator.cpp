@@ -19,14 +19,16 @@
 // pool of meshes of which most, not all, lie in the mod's 3do folder.
 #include "tree_generator.h"
 
+#include "map_records.h"
+
 #include <algorithm>
 #include <cmath>
 #include <cstdio>
-#include <cstring>
 #include <filesystem>
 #include <fstream>
 #include <set>
 #include <unordered_map>
+#include <vector>
 
 namespace fs = std::filesystem;
 
@@ -372,17 +374,6 @@ std::string RenderCatalogue(const TreeShape& shape, const Plan& plan) {
     return text;
 }
 
-void AppendInt32(std::string& bytes, std::uint32_t value) {
-    for (int i = 0; i < 4; ++i) bytes += static_cast<char>((value >> (8 * i)) & 0xFF);
-}
-
-void AppendFloat(std::string& bytes, float value) {
-    std::uint32_t bits;
-    static_assert(sizeof bits == sizeof value);
-    std::memcpy(&bits, &value, sizeof bits);
-    AppendInt32(bytes, bits);
-}
-
 bool WriteFileBytes(const fs::path& path, const std::string& bytes) {
     std::ofstream out(path, std::ios::binary | std::ios::trunc);
     out.write(bytes.data(), static_cast<std::streamsize>(bytes.size()));
@@ -411,25 +402,6 @@ std::vector<std::string> PlacedClassNames(const Plan& plan, int count, Random& r
 }  // namespace
 
 std::string GenerateCatalogue(const TreeShape& shape) { return RenderCatalogue(shape, MakePlan(shape)); }
-
-// Layout: "ASTC", the count, then per object the class name, NUL, and the placement as binary
-// numbers: an id, x, y, z and yaw as floats, and flags.
-std::string ActorsStaticBytes(const std::vector<std::string>& classNames, std::uint64_t seed) {
-    Random random{seed};
-    std::string bytes = "ASTC";
-    AppendInt32(bytes, static_cast<std::uint32_t>(classNames.size()));
-    for (std::size_t i = 0; i < classNames.size(); ++i) {
-        bytes += classNames[i];
-        bytes += '\0';
-        AppendInt32(bytes, static_cast<std::uint32_t>(i));
-        AppendFloat(bytes, static_cast<float>(random.Unit() * 200000.0));
-        AppendFloat(bytes, static_cast<float>(random.Unit() * 200000.0));
-        AppendFloat(bytes, static_cast<float>(random.Unit() * 300.0));
-        AppendFloat(bytes, static_cast<float>(random.Unit() * 360.0));
-        AppendInt32(bytes, static_cast<std::uint32_t>(random.Next() & 0x3));
-    }
-    return bytes;
-}
 
 std::string TreeShapeText(const TreeShape& shape) {
     return "seed " + std::to_string(shape.seed) + "\nobjects " + std::to_string(shape.objects) + "\nmods " +
@@ -480,7 +452,7 @@ bool WriteGeneratedTree(const TreeShape& shape, const std::string& outFolder, Tr
     Random random{shape.seed ^ 0x3A95ull};
     for (int m = 0; m < shape.maps; ++m) {
         fs::path map = out / "mods/mapmods/maps" / ("Map" + std::to_string(m + 1));
-        std::string bytes = ActorsStaticBytes(PlacedClassNames(plan, shape.mapNames, random), random.Next());
+        std::string bytes = MapRecordBytes(PlacedClassNames(plan, shape.mapNames, random));
         if (!makeFolder(map) || !WriteFileBytes(map / "actors.static", bytes)) {
             error = "cannot write " + (map / "actors.static").string();
             return false;

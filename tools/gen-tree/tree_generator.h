@@ -4,7 +4,6 @@
 
 #include <cstdint>
 #include <string>
-#include <vector>
 
 struct TreeShape {
     std::uint64_t seed = 1;
@@ -26,10 +25,6 @@ struct TreeSummary {
 
 // The catalogue's bytes alone; the same shape and seed give the same bytes.
 std::string GenerateCatalogue(const TreeShape& shape);
-
-// The bytes of an actors.static placing these class names ("com.maddox.il2.objects." + section
-// name), each ended by NUL and followed by the binary numbers of its placement.
-std::string ActorsStaticBytes(const std::vector<std::string>& classNames, std::uint64_t seed);
 
 // Writes the tree under outFolder: mods/std/com/maddox/il2/objects/static.ini, mods/<mod>/3do/...,
 // mods/mapmods/maps/<map>/actors.static, and gen-tree.txt naming the shape. An outFolder that is
