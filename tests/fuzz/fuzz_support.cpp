@@ -65,6 +65,12 @@ std::string ReadScratchFile(const std::string& name, bool& exists) {
     return text.str();
 }
 
+bool IsScratchFile(const std::string& name) {
+    ScratchFolder();
+    std::error_code error;
+    return fs::is_regular_file(HostScratch + "/" + name, error);
+}
+
 std::string ReadDesktopFile(const std::string& name, bool& exists) { return ReadScratchFile("Desktop/" + name, exists); }
 
 std::string BaselineOutput(const std::string& baseline, const std::string& report, bool& exists) {

@@ -17,6 +17,8 @@ void ResetForInput();
 void WriteScratchFile(const std::string& name, const std::string& bytes);
 // The file's bytes; exists tells whether it was there.
 std::string ReadScratchFile(const std::string& name, bool& exists);
+// Whether the name is a file, not a folder, in the scratch folder; letter case counts.
+bool IsScratchFile(const std::string& name);
 std::string ReadDesktopFile(const std::string& name, bool& exists);
 // Runs a bench baseline on the scratch catalogue and gives the report it wrote (or, for
 // "@static.ini", the catalogue it rewrote, which must then be a copy in the folder "copy").
