@@ -2,7 +2,9 @@
 // byte for byte as the desktop program writes them; exit status 0 nothing found, 1 findings,
 // 2 bad usage or a catalogue or report that could not be read or written.
 #include "checks/doubled_objects.h"
+#include "checks/mesh_references.h"
 #include "cli/cli_options.h"
+#include "location/derived_paths.h"
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
 #include "shell/progress_list.h"
@@ -22,6 +24,10 @@ struct CliCommand {
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"wrong-sim-references", "mesh files that no 3do folder of a mod holds",
+     [](const CliOptions&) { return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "missing"); }},
+    {"doubled-used-sims", "objects whose MeshLive and MeshDead are the same file",
+     [](const CliOptions&) { return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "doubled"); }},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
