@@ -95,7 +95,8 @@ MeshPathPlan PlanMeshPaths(const std::vector<MeshIndexEntry>& index) {
         if (index[entry].title.empty()) continue;
         for (const MeshSlot& slot : MeshSlots) {
             const std::string& value = index[entry].*slot.value;
-            if (value.empty() || index[entry].*slot.found) continue;
+            // A value ending in "\" names a folder, never a mesh file.
+            if (value.empty() || value.back() == '\\' || index[entry].*slot.found) continue;
             auto [it, added] = fileOfValue.try_emplace(value, static_cast<int>(plan.files.size()));
             if (added) plan.files.push_back({value, {}, -1, false});
             plan.files[it->second].refs.push_back({entry, &slot});
