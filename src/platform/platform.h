@@ -10,6 +10,9 @@
 
 using Handle = std::uintptr_t;  // a window, control, menu or open file; 0 means none
 
+// Once at start: common controls (version 6, as the manifest asks) and COM single-threaded.
+void InitPlatform();
+
 //--- windows
 
 struct FrameStyle {

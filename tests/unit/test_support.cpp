@@ -67,3 +67,14 @@ std::string CrLf(const Strings& lines) {
     for (const std::string& line : lines) text += line + "\r\n";
     return text;
 }
+
+HeadlessStep ChooserOkStep() {
+    return [] {
+        Event event;
+        event.window = HeadlessFindWindow("Searching static.ini");
+        event.kind = EventKind::Control;
+        event.control = HeadlessControlByKind(event.window, "push");
+        event.id = HeadlessControlOf(event.control)->id;
+        return event;
+    };
+}

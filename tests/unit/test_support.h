@@ -1,6 +1,8 @@
 // A scratch folder per test, the headless platform reset, and file helpers.
 #pragma once
 
+#include "platform/headless/headless.h"
+
 #include <gtest/gtest.h>
 
 #include <string>
@@ -32,6 +34,9 @@ protected:
 
     std::string root;
 };
+
+// A click on "OK" in the folder chooser.
+HeadlessStep ChooserOkStep();
 
 // Joins lines each followed by CR LF.
 std::string CrLf(const Strings& lines);

@@ -69,6 +69,8 @@ Handle NewestOpenWindow() {
 
 }  // namespace
 
+void InitPlatform() {}
+
 //--- windows
 
 Handle OpenTopWindow(const std::string& title, int left, int top, int clientWidth, int clientHeight,
