@@ -51,16 +51,6 @@ TEST(MeshReferences, CutsTheValueFromItsFirst3do) {
     }
 }
 
-TEST(MeshReferences, StandardTitlesInTheirOrder) {
-    ASSERT_EQ(StandardTitles.size(), 42u);
-    EXPECT_EQ(StandardTitles[0], "Title House");
-    EXPECT_EQ(StandardTitles[12], "Title Vehicles");
-    EXPECT_EQ(StandardTitles[24], "Title House Pacific");
-    EXPECT_EQ(StandardTitles[28], "Title Houses of Kiev winter");
-    EXPECT_EQ(StandardTitles[41], "Title Humans");
-    for (const std::string& title : StandardTitles) EXPECT_EQ(title.rfind("Title ", 0), 0u) << title;
-}
-
 class MeshIndexTest : public ScratchTest {
 protected:
     Strings IndexOf(const Strings& lines) {
