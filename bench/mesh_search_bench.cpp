@@ -31,7 +31,9 @@ std::string ObjectFolder(const Tree& tree, int entry) {
     return "3do/Buildings/Mod" + std::to_string(entry % tree.mods) + "/Obj" + std::to_string(entry);
 }
 
-std::string ModFolder(const Tree& tree, int mod) { return tree.folder + "/mods/Mod" + std::to_string(mod) + "/"; }
+std::string ModFolder(const Tree& tree, int mod) {
+    return tree.folder + "/mods/Mod" + std::to_string(mod) + "/";
+}
 
 void WriteMesh(const std::string& path) {
     fs::create_directories(fs::path(path).parent_path());
@@ -40,7 +42,8 @@ void WriteMesh(const std::string& path) {
 
 // Made once per size; a stamp file tells that the tree is complete.
 void GenerateTree(const Tree& tree) {
-    std::string stamp = tree.folder + "/generated-" + std::to_string(tree.entries) + "x" + std::to_string(tree.mods);
+    std::string stamp =
+        tree.folder + "/generated-" + std::to_string(tree.entries) + "x" + std::to_string(tree.mods);
     if (fs::exists(stamp)) return;
     fs::remove_all(tree.folder);
     for (int mod = 0; mod < tree.mods; ++mod) fs::create_directories(ModFolder(tree, mod) + "3do/Plane");
@@ -82,7 +85,8 @@ struct Run {
 Run Measure(const Tree& tree, void (*search)(std::vector<MeshIndexEntry>&, const std::string&, Handle)) {
     HeadlessReset();
     ProgressListOn = false;
-    Handle bar = AddProgressBar(OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{}), 10, 10, 160, 20, 0, 35);
+    Handle bar =
+        AddProgressBar(OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{}), 10, 10, 160, 20, 0, 35);
     std::vector<MeshIndexEntry> index = MakeIndex(tree);
     std::string modsRoot = HeadlessProgramPath(tree.folder + "/mods") + "\\";
     HeadlessFileCounters before = HeadlessCounters();
@@ -94,7 +98,8 @@ Run Measure(const Tree& tree, void (*search)(std::vector<MeshIndexEntry>&, const
     run.counters.listings = HeadlessCounters().listings - before.listings;
     run.barMoves = HeadlessControlOf(bar)->positionsSet;
     for (const MeshIndexEntry& e : index)
-        run.flags += std::string(1, '0' + e.meshFound) + char('0' + e.meshLiveFound) + char('0' + e.meshDeadFound);
+        run.flags +=
+            std::string(1, '0' + e.meshFound) + char('0' + e.meshLiveFound) + char('0' + e.meshDeadFound);
     return run;
 }
 
@@ -107,7 +112,8 @@ int main(int argc, char** argv) {
     tree.folder = argc > 1 ? argv[1] : (fs::temp_directory_path() / "verrant-mesh-bench").string();
     if (argc > 2) tree.entries = std::stoi(argv[2]);
     if (argc > 3) tree.mods = std::stoi(argv[3]);
-    std::printf("tree: %d entries x 3 meshes, %d mods, in %s\n", tree.entries, tree.mods, tree.folder.c_str());
+    std::printf("tree: %d entries x 3 meshes, %d mods, in %s\n", tree.entries, tree.mods,
+                tree.folder.c_str());
     std::fflush(stdout);
     GenerateTree(tree);
 

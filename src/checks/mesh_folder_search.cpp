@@ -29,15 +29,15 @@ struct MeshFile {
 
 struct PathNode {
     int parent = -1;
-    int pending = 0;                                         // files below not yet found
-    std::unordered_map<std::string, int> folders;           // lowered name -> node
+    int pending = 0;                                          // files below not yet found
+    std::unordered_map<std::string, int> folders;             // lowered name -> node
     std::unordered_map<std::string, std::vector<int>> files;  // lowered name -> files
 };
 
 struct MeshPathPlan {
     std::vector<PathNode> nodes;  // node 0 is the mod folder itself
     std::vector<MeshFile> files;
-    std::vector<int> unjudged;    // opened in every searched folder until found
+    std::vector<int> unjudged;  // opened in every searched folder until found
 };
 
 // Whether a listing can show that the name is absent. Windows also opens other spellings of
@@ -106,7 +106,8 @@ MeshPathPlan PlanMeshPaths(const std::vector<MeshIndexEntry>& index) {
     return plan;
 }
 
-void TryFile(MeshPathPlan& plan, std::vector<MeshIndexEntry>& index, int fileIndex, const std::string& modFolder) {
+void TryFile(MeshPathPlan& plan, std::vector<MeshIndexEntry>& index, int fileIndex,
+             const std::string& modFolder) {
     MeshFile& file = plan.files[fileIndex];
     if (file.found) return;
     Handle opened = OpenForReading(modFolder + file.value);

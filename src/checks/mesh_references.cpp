@@ -71,7 +71,9 @@ const std::string SharedRuler(38, '*');
 bool IsSet(const std::string& mesh) { return !mesh.empty(); }
 bool IsMissing(const std::string& mesh, bool found) { return IsSet(mesh) && !found; }
 
-std::string ObjectLine(const MeshIndexEntry& entry) { return "Object (" + std::to_string(entry.number) + ")"; }
+std::string ObjectLine(const MeshIndexEntry& entry) {
+    return "Object (" + std::to_string(entry.number) + ")";
+}
 
 std::string FoundLine(const std::string& key, const std::string& mesh, bool found) {
     return (found ? "Found: " : "Not found: ") + key + " " + mesh;
@@ -200,10 +202,12 @@ void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
 }
 
 bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
-    return output == MeshOutput::ProgressList ? ListMissingMeshes(index, add) : WriteMissingMeshes(index, add);
+    return output == MeshOutput::ProgressList ? ListMissingMeshes(index, add)
+                                              : WriteMissingMeshes(index, add);
 }
 
-bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
+bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
+                                const LineSink& add) {
     const bool list = output == MeshOutput::ProgressList;
     AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, add);
     bool reported = false;
@@ -257,8 +261,9 @@ CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string
     ReportFile report;
     if (!CreateReport(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report))
         return CommandResult::Failed;
-    WriteReportLine(report,
-                    "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked");
+    WriteReportLine(
+        report,
+        "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked");
     WriteReportLine(report, "Mod objects using sims/meshes of standard objects will cause wrong alert");
     WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:"
                                         : "Doubled used sims in your static.ini:");

@@ -46,7 +46,8 @@ void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index);
 enum class MeshOutput { ProgressList, ReportBody };
 using LineSink = std::function<void(const std::string&)>;
 bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add);
-bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add);
+bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
+                                const LineSink& add);
 
 // The whole run for mode "missing" or "doubled" (any other mode runs as "doubled"). Reads
 // CatalogueFolder; modsRoot ends in "\". Always writes and opens its report.

@@ -32,7 +32,8 @@ std::string Flags(const std::vector<MeshIndexEntry>& index) {
 // The positions the bar takes after so many visits: the first move after 5000, then every 4999.
 std::vector<int> BarMovesAfter(long long visits) {
     std::vector<int> positions;
-    for (long long at = 5000; at <= visits; at += 4999) positions.push_back(static_cast<int>(positions.size()) % 35 + 1);
+    for (long long at = 5000; at <= visits; at += 4999)
+        positions.push_back(static_cast<int>(positions.size()) % 35 + 1);
     return positions;
 }
 
@@ -121,12 +122,13 @@ TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {
         };
         for (int mod = 0; mod < 6; ++mod) {
             std::string modFolder = mod == 0 ? mods : mods + "/Mod" + std::to_string(mod);
-            for (int file = 0; file < 6; ++file) Write(modFolder + "/" + pick(meshFolders) + "/" + randomPath(), "x");
+            for (int file = 0; file < 6; ++file)
+                Write(modFolder + "/" + pick(meshFolders) + "/" + randomPath(), "x");
         }
         Write(game + "/3do/" + randomPath(), "x");
         std::vector<MeshIndexEntry> index;
-        const Strings odd = {"", "", "3do\\.\\a.sim", "3do\\..\\3do\\a.sim", "3do\\a.sim.", "3DO\\", "3do",
-                             "3do\\m.sim", "3do_old\\a.sim", "3do\\Sea\\\\a.sim"};
+        const Strings odd = {"",      "",    "3do\\.\\a.sim", "3do\\..\\3do\\a.sim", "3do\\a.sim.",
+                             "3DO\\", "3do", "3do\\m.sim",    "3do_old\\a.sim",      "3do\\Sea\\\\a.sim"};
         auto value = [&] {
             if (random() % 4 == 0) return pick(odd);
             std::string path = pick(meshFolders) + "/" + randomPath();

@@ -9,15 +9,16 @@
 
 namespace {
 
-const std::string Header = "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not "
-                           "checked\r\nMod objects using sims/meshes of standard objects will cause wrong alert\r\n";
+const std::string Header =
+    "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not "
+    "checked\r\nMod objects using sims/meshes of standard objects will cause wrong alert\r\n";
 const std::string MissingHeader = Header + "Wrong sim references in your static.ini:\r\n\r\n";
 const std::string DoubledHeader = Header + "Doubled used sims in your static.ini:\r\n\r\n";
 const std::string Stars14(14, '*'), Stars38(38, '*');
 
 std::string Describe(const MeshIndexEntry& entry) {
-    return std::to_string(entry.number) + "|" + entry.title + "|" + entry.sectionName + "|" + entry.mesh + "|" +
-           entry.meshLive + "|" + entry.meshDead;
+    return std::to_string(entry.number) + "|" + entry.title + "|" + entry.sectionName + "|" + entry.mesh +
+           "|" + entry.meshLive + "|" + entry.meshDead;
 }
 
 // The lines a run added after "Searching folders & files" and its blank.
@@ -64,15 +65,35 @@ protected:
 };
 
 TEST_F(MeshIndexTest, ReadsEntriesFromTheFirstGroupMarkerOn) {
-    EXPECT_EQ(IndexOf({"[buildings.House$Before]", "Mesh 3do/before.sim", "[***] note", "  [***]  ",
-                       " Title Mods ", "Mesh 3do/orphan.sim", "(0)", "[buildings.House$A]", "Mesh 3do/a/one.sim",
-                       "Mesh 3do/a/two.sim", "Mesh a/no/mesh/folder.sim", "MeshLiveX 3do/a/live.sim",
-                       "MeshDead   ../3DO/a/dead.sim", "[Buildings.House$Capital]", "Mesh 3do/capital.sim",
-                       "[airfield.Thing]", "MeshDead 3do/air.sim", "Mesh", "Mesh\t3do/tab.sim",
-                       "[buildings.Plate$B] // note", "[***]", "[buildings.House$Title]", "MeshLive 3do/b.sim",
-                       "[***]", "[bui", "[buildings.House$C]"}),
-              Strings({"0| Title Mods |buildings.House$A|3do\\capital.sim|3do\\a\\live.sim|3do\\air.sim",
-                       "1| Title Mods |buildings.Plate$B] // not||3do\\b.sim|", "2|[bui|buildings.House$C|||"}));
+    EXPECT_EQ(
+        IndexOf({"[buildings.House$Before]",
+                 "Mesh 3do/before.sim",
+                 "[***] note",
+                 "  [***]  ",
+                 " Title Mods ",
+                 "Mesh 3do/orphan.sim",
+                 "(0)",
+                 "[buildings.House$A]",
+                 "Mesh 3do/a/one.sim",
+                 "Mesh 3do/a/two.sim",
+                 "Mesh a/no/mesh/folder.sim",
+                 "MeshLiveX 3do/a/live.sim",
+                 "MeshDead   ../3DO/a/dead.sim",
+                 "[Buildings.House$Capital]",
+                 "Mesh 3do/capital.sim",
+                 "[airfield.Thing]",
+                 "MeshDead 3do/air.sim",
+                 "Mesh",
+                 "Mesh\t3do/tab.sim",
+                 "[buildings.Plate$B] // note",
+                 "[***]",
+                 "[buildings.House$Title]",
+                 "MeshLive 3do/b.sim",
+                 "[***]",
+                 "[bui",
+                 "[buildings.House$C]"}),
+        Strings({"0| Title Mods |buildings.House$A|3do\\capital.sim|3do\\a\\live.sim|3do\\air.sim",
+                 "1| Title Mods |buildings.Plate$B] // not||3do\\b.sim|", "2|[bui|buildings.House$C|||"}));
 }
 
 TEST_F(MeshIndexTest, CatalogueWithoutGroupMarkerGivesNoEntries) {
@@ -94,8 +115,8 @@ TEST_F(MeshIndexTest, ExcludesStandardGroupsByTheirWholeTitleLine) {
         {"Title Mods", "", false, true},
     };
     for (const Case& c : cases) {
-        UseCatalogue(CrLf({"[***]", c.firstTitle, "[buildings.House$A]", "[***]", c.laterTitle,
-                           "[buildings.House$B]"}));
+        UseCatalogue(CrLf(
+            {"[***]", c.firstTitle, "[buildings.House$A]", "[***]", c.laterTitle, "[buildings.House$B]"}));
         std::vector<MeshIndexEntry> index;
         ASSERT_TRUE(BuildMeshIndex(CatalogueFolder, index));
         ExcludeStandardTitles(index);
@@ -130,7 +151,9 @@ class CheckMeshReferencesTest : public ScratchTest {
 protected:
     std::string ModsRoot() const { return Folder("Game/mods"); }
     void Mesh(const std::string& relative) const { Write("Game/" + relative, "sim"); }
-    void UseModsCatalogue(const Strings& lines) { UseCatalogue(CrLf(lines), "Game/mods/std/com/maddox/il2/objects"); }
+    void UseModsCatalogue(const Strings& lines) {
+        UseCatalogue(CrLf(lines), "Game/mods/std/com/maddox/il2/objects");
+    }
     // Catches the Wait window at the run's first drain of events.
     void WatchWaitWindow() {
         HeadlessPushPending([this] {
@@ -138,23 +161,41 @@ protected:
             return Event();
         });
     }
-    const HeadlessControl* WaitBar() const { return HeadlessControlOf(HeadlessControlByKind(waitWindow, "progress")); }
+    const HeadlessControl* WaitBar() const {
+        return HeadlessControlOf(HeadlessControlByKind(waitWindow, "progress"));
+    }
 
     Handle waitWindow = 0;
 };
 
 TEST_F(CheckMeshReferencesTest, MissingModeListsEveryMeshAndReportsTheMissingOnes) {
-    UseModsCatalogue({"[***]", "Title House", "[buildings.House$Std]", "Mesh 3do/Std/gone.sim", "[***]",
-                      "Title Mods", "[buildings.House$Both]", "Mesh 3do/Both/mono.sim", "MeshLive 3do/Both/live.sim",
-                      "[buildings.House$LiveOnly]", "MeshLive 3do/L/live.sim", "MeshDead 3do/L/dead.sim",
-                      "[buildings.House$NoneFound]", "MeshLive 3do/N/live.sim", "MeshDead 3do/N/dead.sim",
-                      "[buildings.House$DeadOnly]", "MeshDead 3DO/D/dead.sim", "[buildings.House$Fine]",
-                      "Mesh 3do/F/mono.sim", "MeshLive 3do/F/live.sim", "MeshDead 3do/F/dead.sim",
-                      "[buildings.House$Bare]", "Body x"});
-    Mesh("mods/ModA/3DO/L/live.sim");     // capital 3DO folder is searched, its name matched in any case
+    UseModsCatalogue({"[***]",
+                      "Title House",
+                      "[buildings.House$Std]",
+                      "Mesh 3do/Std/gone.sim",
+                      "[***]",
+                      "Title Mods",
+                      "[buildings.House$Both]",
+                      "Mesh 3do/Both/mono.sim",
+                      "MeshLive 3do/Both/live.sim",
+                      "[buildings.House$LiveOnly]",
+                      "MeshLive 3do/L/live.sim",
+                      "MeshDead 3do/L/dead.sim",
+                      "[buildings.House$NoneFound]",
+                      "MeshLive 3do/N/live.sim",
+                      "MeshDead 3do/N/dead.sim",
+                      "[buildings.House$DeadOnly]",
+                      "MeshDead 3DO/D/dead.sim",
+                      "[buildings.House$Fine]",
+                      "Mesh 3do/F/mono.sim",
+                      "MeshLive 3do/F/live.sim",
+                      "MeshDead 3do/F/dead.sim",
+                      "[buildings.House$Bare]",
+                      "Body x"});
+    Mesh("mods/ModA/3DO/L/live.sim");         // capital 3DO folder is searched, its name matched in any case
     Mesh("mods/ModA/3do_old/Both/mono.sim");  // a decoy: no such folder is searched
-    Mesh("mods/3do/F/mono.sim");          // the mods root's own 3do folder, through "."
-    Mesh("3do/F/live.sim");               // the folder above the mods root, through ".."
+    Mesh("mods/3do/F/mono.sim");              // the mods root's own 3do folder, through "."
+    Mesh("3do/F/live.sim");                   // the folder above the mods root, through ".."
     Mesh("mods/ModB/3do/f/DEAD.SIM");
     Mesh("mods/ModB/3do/Both/mono.sim/inside");  // a folder is not a mesh file
     Mesh("mods/ModC/nothing.txt");
@@ -164,27 +205,66 @@ TEST_F(CheckMeshReferencesTest, MissingModeListsEveryMeshAndReportsTheMissingOne
 
     EXPECT_EQ(CheckMeshReferences(ModsRoot(), "missing"), CommandResult::Findings);
 
-    EXPECT_EQ(AfterSearchingLines(ProgressLines()),
-              Strings({"Check: ...\\mods\\.\\3do", "Check: ...\\mods\\..\\3do", "Check: ...\\mods\\ModA\\3do",
-                       "Check: ...\\mods\\ModB\\3do", " ", "//**************************", "Starting output", " ",
-                       Stars14, "Object (1)", "buildings.House$Both", "Not found: Mesh 3do\\Both\\mono.sim",
-                       Stars14, "Object (1)", "buildings.House$Both", "Not found: MeshLive 3do\\Both\\live.sim",
-                       Stars14, "Object (2)", "buildings.House$LiveOnly", "Found: MeshLive 3do\\L\\live.sim",
-                       "Not Found: MeshDead 3do\\L\\dead.sim", Stars14, "Object (3)", "buildings.House$NoneFound",
-                       "Not found: MeshLive 3do\\N\\live.sim", "Not Found: MeshDead 3do\\N\\dead.sim", Stars14,
-                       "Object (4)", "buildings.House$DeadOnly", "Not Found: MeshDead 3DO\\D\\dead.sim", Stars14,
-                       "Object (5)", "buildings.House$Fine", "Found: Mesh 3do\\F\\mono.sim", Stars14, "Object (5)",
-                       "buildings.House$Fine", "Found: MeshLive 3do\\F\\live.sim",
-                       "Found: MeshDead 3do\\F\\dead.sim"}));
-    EXPECT_EQ(Desktop("Missing_3do.txt"),
-              MissingHeader + CrLf({Stars14, "Object (1)", "buildings.House$Both",
-                                    "Not found: Mesh 3do\\Both\\mono.sim", Stars14, "Object (1)",
-                                    "buildings.House$Both", "Not found: MeshLive 3do\\Both\\live.sim", Stars14,
-                                    "Object (2)", "buildings.House$LiveOnly", "Not found: MeshDead 3do\\L\\dead.sim",
-                                    Stars14, "Object (3)", "buildings.House$NoneFound",
-                                    "Not found: MeshLive 3do\\N\\live.sim", "Not found: MeshDead 3do\\N\\dead.sim",
-                                    Stars14, "Object (4)", "buildings.House$DeadOnly",
-                                    "Not found: MeshDead 3DO\\D\\dead.sim"}));
+    EXPECT_EQ(AfterSearchingLines(ProgressLines()), Strings({"Check: ...\\mods\\.\\3do",
+                                                             "Check: ...\\mods\\..\\3do",
+                                                             "Check: ...\\mods\\ModA\\3do",
+                                                             "Check: ...\\mods\\ModB\\3do",
+                                                             " ",
+                                                             "//**************************",
+                                                             "Starting output",
+                                                             " ",
+                                                             Stars14,
+                                                             "Object (1)",
+                                                             "buildings.House$Both",
+                                                             "Not found: Mesh 3do\\Both\\mono.sim",
+                                                             Stars14,
+                                                             "Object (1)",
+                                                             "buildings.House$Both",
+                                                             "Not found: MeshLive 3do\\Both\\live.sim",
+                                                             Stars14,
+                                                             "Object (2)",
+                                                             "buildings.House$LiveOnly",
+                                                             "Found: MeshLive 3do\\L\\live.sim",
+                                                             "Not Found: MeshDead 3do\\L\\dead.sim",
+                                                             Stars14,
+                                                             "Object (3)",
+                                                             "buildings.House$NoneFound",
+                                                             "Not found: MeshLive 3do\\N\\live.sim",
+                                                             "Not Found: MeshDead 3do\\N\\dead.sim",
+                                                             Stars14,
+                                                             "Object (4)",
+                                                             "buildings.House$DeadOnly",
+                                                             "Not Found: MeshDead 3DO\\D\\dead.sim",
+                                                             Stars14,
+                                                             "Object (5)",
+                                                             "buildings.House$Fine",
+                                                             "Found: Mesh 3do\\F\\mono.sim",
+                                                             Stars14,
+                                                             "Object (5)",
+                                                             "buildings.House$Fine",
+                                                             "Found: MeshLive 3do\\F\\live.sim",
+                                                             "Found: MeshDead 3do\\F\\dead.sim"}));
+    EXPECT_EQ(Desktop("Missing_3do.txt"), MissingHeader + CrLf({Stars14,
+                                                                "Object (1)",
+                                                                "buildings.House$Both",
+                                                                "Not found: Mesh 3do\\Both\\mono.sim",
+                                                                Stars14,
+                                                                "Object (1)",
+                                                                "buildings.House$Both",
+                                                                "Not found: MeshLive 3do\\Both\\live.sim",
+                                                                Stars14,
+                                                                "Object (2)",
+                                                                "buildings.House$LiveOnly",
+                                                                "Not found: MeshDead 3do\\L\\dead.sim",
+                                                                Stars14,
+                                                                "Object (3)",
+                                                                "buildings.House$NoneFound",
+                                                                "Not found: MeshLive 3do\\N\\live.sim",
+                                                                "Not found: MeshDead 3do\\N\\dead.sim",
+                                                                Stars14,
+                                                                "Object (4)",
+                                                                "buildings.House$DeadOnly",
+                                                                "Not found: MeshDead 3DO\\D\\dead.sim"}));
     ASSERT_EQ(HeadlessProcesses().size(), 1u);
     EXPECT_EQ(HeadlessProcesses()[0].commandLine, "\"C:\\WINDOWS\\notepad.exe\" Missing_3do.txt");
     EXPECT_EQ(Messages(), Strings{});
@@ -201,20 +281,37 @@ TEST_F(CheckMeshReferencesTest, RunShowsItsStepsInOrder) {
     const std::string ruler = "//**************************";
     EXPECT_EQ(Strings(lines.begin(), lines.begin() + 5),
               Strings({ruler, "Building object index", ruler, "Excluding Standard Titles", " "}));
-    EXPECT_EQ(Strings(lines.end() - 17, lines.end()),
-              Strings({ruler, "Excluding Title Humans", " ", " ", ruler, "Searching folders & files", " ",
-                       "Check: ...\\mods\\ModA\\3do", " ", ruler, "Starting output", " ", Stars14, "Object (0)",
-                       "buildings.House$A", "Found: Mesh 3do\\a.sim", "No missing Meshs found"}));
+    EXPECT_EQ(
+        Strings(lines.end() - 17, lines.end()),
+        Strings({ruler, "Excluding Title Humans", " ", " ", ruler, "Searching folders & files", " ",
+                 "Check: ...\\mods\\ModA\\3do", " ", ruler, "Starting output", " ", Stars14, "Object (0)",
+                 "buildings.House$A", "Found: Mesh 3do\\a.sim", "No missing Meshs found"}));
     EXPECT_EQ(Desktop("Missing_3do.txt"), MissingHeader + "No wrong references found\r\n");
 }
 
 TEST_F(CheckMeshReferencesTest, DoubledModeListsEntriesWithTheSameLiveAndDeadMesh) {
-    UseModsCatalogue({"[***]", "Title Humans", "[buildings.House$Std]", "MeshLive 3do/s.sim", "MeshDead 3do/s.sim",
-                      "[***]", "Title Mods", "[buildings.House$Slashes]", "MeshLive 3do/Buildings/A/live.sim",
-                      "MeshDead 3do\\Buildings\\A\\live.sim", "[buildings.House$Case]", "MeshLive 3do/a/x.sim",
-                      "MeshDead 3DO/a/x.sim", "[buildings.House$Prefix]", "MeshLive ../3do/a/x.sim",
-                      "MeshDead mods/3do/a/x.sim", "[buildings.House$NoValue]", "MeshLive a/x.sim",
-                      "MeshDead a/x.sim", "[buildings.House$Differ]", "MeshLive 3do/a.sim", "MeshDead 3do/b.sim"});
+    UseModsCatalogue({"[***]",
+                      "Title Humans",
+                      "[buildings.House$Std]",
+                      "MeshLive 3do/s.sim",
+                      "MeshDead 3do/s.sim",
+                      "[***]",
+                      "Title Mods",
+                      "[buildings.House$Slashes]",
+                      "MeshLive 3do/Buildings/A/live.sim",
+                      "MeshDead 3do\\Buildings\\A\\live.sim",
+                      "[buildings.House$Case]",
+                      "MeshLive 3do/a/x.sim",
+                      "MeshDead 3DO/a/x.sim",
+                      "[buildings.House$Prefix]",
+                      "MeshLive ../3do/a/x.sim",
+                      "MeshDead mods/3do/a/x.sim",
+                      "[buildings.House$NoValue]",
+                      "MeshLive a/x.sim",
+                      "MeshDead a/x.sim",
+                      "[buildings.House$Differ]",
+                      "MeshLive 3do/a.sim",
+                      "MeshDead 3do/b.sim"});
     Mesh("mods/ModA/3do/unrelated.sim");
     ProgressListOn = true;
     OpenProgressList();
@@ -228,10 +325,11 @@ TEST_F(CheckMeshReferencesTest, DoubledModeListsEntriesWithTheSameLiveAndDeadMes
                        "MeshDead: 3do\\Buildings\\A\\live.sim", Stars14, "Object (3)buildings.House$Prefix",
                        "MeshLive: 3do\\a\\x.sim", "MeshDead: 3do\\a\\x.sim"}));
     EXPECT_EQ(Desktop("Doubled_sims_or_meshes.txt"),
-              DoubledHeader + CrLf({" ", Stars38, "Using the same MeshLive/MeshDead", Stars38, " ", Stars14,
-                                    "Object (1)", "buildings.House$Slashes", "MeshLive: 3do\\Buildings\\A\\live.sim",
-                                    "MeshDead: 3do\\Buildings\\A\\live.sim", Stars14, "Object (3)",
-                                    "buildings.House$Prefix", "MeshLive: 3do\\a\\x.sim", "MeshDead: 3do\\a\\x.sim"}));
+              DoubledHeader +
+                  CrLf({" ", Stars38, "Using the same MeshLive/MeshDead", Stars38, " ", Stars14, "Object (1)",
+                        "buildings.House$Slashes", "MeshLive: 3do\\Buildings\\A\\live.sim",
+                        "MeshDead: 3do\\Buildings\\A\\live.sim", Stars14, "Object (3)",
+                        "buildings.House$Prefix", "MeshLive: 3do\\a\\x.sim", "MeshDead: 3do\\a\\x.sim"}));
     ASSERT_NE(WaitBar(), nullptr);
     EXPECT_TRUE(WaitBar()->positionsSet.empty());
     ASSERT_EQ(HeadlessProcesses().size(), 1u);
@@ -243,7 +341,8 @@ TEST_F(CheckMeshReferencesTest, NothingFoundStillWritesAndOpensTheReport) {
         std::string mode, file, body, listEnd;
     };
     const Case cases[] = {
-        {"missing", "Missing_3do.txt", MissingHeader + "No wrong references found\r\n", "No missing Meshs found"},
+        {"missing", "Missing_3do.txt", MissingHeader + "No wrong references found\r\n",
+         "No missing Meshs found"},
         {"doubled", "Doubled_sims_or_meshes.txt",
          DoubledHeader + CrLf({" ", Stars38, "Using the same MeshLive/MeshDead", Stars38, " ",
                                "No doubled used Meshs found"}),
@@ -277,8 +376,8 @@ TEST_F(CheckMeshReferencesTest, WaitWindowIsOpenOnlyDuringTheRun) {
     EXPECT_FALSE(wait->open);
     const HeadlessControl* bar = WaitBar();
     ASSERT_NE(bar, nullptr);
-    EXPECT_EQ(std::vector<int>({bar->left, bar->top, bar->width, bar->height, bar->minimum, bar->maximum,
-                                bar->position}),
+    EXPECT_EQ(std::vector<int>(
+                  {bar->left, bar->top, bar->width, bar->height, bar->minimum, bar->maximum, bar->position}),
               std::vector<int>({10, 10, 160, 20, 0, 35, 0}));
 }
 

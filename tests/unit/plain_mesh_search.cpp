@@ -6,7 +6,8 @@
 #include "shell/messages.h"
 #include "shell/progress_list.h"
 
-void SearchModMeshFoldersPlainly(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar) {
+void SearchModMeshFoldersPlainly(std::vector<MeshIndexEntry>& index, const std::string& modsRoot,
+                                 Handle bar) {
     int visits = 0, position = 0;
     std::vector<FolderEntry> mods, inMod;
     if (!ListFolder(modsRoot + "*.*", mods)) return;
