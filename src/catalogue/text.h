@@ -7,3 +7,5 @@
 std::string LowerCopy(const std::string& text);
 bool StartsWith(const std::string& text, const std::string& prefix);
 bool Contains(const std::string& text, const std::string& part);
+// "(" + the number + ")", the way number lines and object lists write an object's number.
+std::string NumberInParentheses(long long number);

@@ -230,7 +230,6 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
 }
 
 CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode) {
-    if (CatalogueFolder.empty()) return CommandResult::NoFolder;
     const bool missingMode = mode == "missing";
     Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
     Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);

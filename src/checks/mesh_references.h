@@ -50,5 +50,5 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
                                 const LineSink& add);
 
 // The whole run for mode "missing" or "doubled" (any other mode runs as "doubled"). Reads
-// CatalogueFolder; modsRoot ends in "\". Always writes and opens its report.
+// CatalogueFolder, which must be known; modsRoot ends in "\". Always writes and opens its report.
 CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode);

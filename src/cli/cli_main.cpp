@@ -1,12 +1,16 @@
 // verrant-cli: the checks without windows, for scripts and modpack builds. Reports are written
-// byte for byte as the desktop program writes them; exit status 0 nothing found, 1 findings,
-// 2 bad usage or a catalogue or report that could not be read or written.
+// byte for byte as the desktop program writes them; exit status 0 nothing found (or the catalogue
+// rewritten, or the list written), 1 findings, 2 bad usage or a catalogue or report that could not
+// be read or written.
 #include "checks/doubled_objects.h"
 #include "checks/mesh_references.h"
 #include "cli/cli_options.h"
 #include "location/derived_paths.h"
 #include "platform/headless/headless.h"
+#include "rewrite/mission_builder_list.h"
+#include "rewrite/renumbering.h"
 #include "shell/app_state.h"
+#include "shell/event_loop.h"
 #include "shell/progress_list.h"
 
 #include <cstdio>
@@ -21,13 +25,34 @@ struct CliCommand {
     std::function<CommandResult(const CliOptions&)> run;
 };
 
+// The rewrite and list commands take the folder, as the menu gives it once one is known.
+CommandResult InCatalogueFolder(CommandResult (*command)(const std::string&, const std::string&),
+                                const std::string& mode) {
+    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
+    return command(CatalogueFolder, mode);
+}
+
+// The mesh reference run takes the mods root of the folder, as the menu gives it.
+CommandResult WithModsRoot(const std::string& mode) {
+    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
+    return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), mode);
+}
+
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"renumber", "rewrites static.ini with a number line above every building header",
+     [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "renumber"); }},
+    {"denumber", "rewrites static.ini without its number lines",
+     [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "denumber"); }},
+    {"fmb-list", "object list for the mission builder, without plates (Static_list_FMB.txt)",
+     [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb"); }},
+    {"fmb-plus-list", "object list for FMB+, with plates (Static_list_FMBplus.txt)",
+     [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb+"); }},
     {"wrong-sim-references", "mesh files that no 3do folder of a mod holds",
-     [](const CliOptions&) { return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "missing"); }},
+     [](const CliOptions&) { return WithModsRoot("missing"); }},
     {"doubled-used-sims", "objects whose MeshLive and MeshDead are the same file",
-     [](const CliOptions&) { return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "doubled"); }},
+     [](const CliOptions&) { return WithModsRoot("doubled"); }},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
@@ -40,6 +65,8 @@ void PrintHelp(std::FILE* to) {
                  "  --progress        print the progress list's lines to standard output\n"
                  "commands:\n");
     for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
+    std::fprintf(to, "exit status: 0 nothing found, catalogue rewritten or list written; 1 findings reported;\n"
+                     "  2 bad usage, or a catalogue, report or list that could not be read or written\n");
 }
 
 // The program's own form of a host folder: absolute, "\" separators, ending in "\".
@@ -92,6 +119,7 @@ int main(int argc, char** argv) {
     std::fflush(stdout);
     switch (result) {
         case CommandResult::NothingFound: return ExitNothingFound;
+        case CommandResult::Done: return ExitNothingFound;
         case CommandResult::Findings: return ExitFindings;
         case CommandResult::NoFolder:
             std::fprintf(stderr, "verrant-cli: no catalogue folder: give --catalogue DIR\n");

@@ -6,4 +6,5 @@ enum class CommandResult {
     Findings,      // ran and reported findings
     Failed,        // could not read or write what it needs; the user was told
     NoFolder,      // no catalogue folder was known or chosen
+    Done,          // rewrote the catalogue or wrote an object list
 };

@@ -6,12 +6,6 @@ namespace {
 
 const std::size_t ReportBlockSize = 1 << 16;
 
-void WritePending(ReportFile& report) {
-    if (!report.pending.empty() && !WriteBytes(report.file, report.pending.data(), report.pending.size()))
-        report.failed = true;
-    report.pending.clear();
-}
-
 void TellReportFailure(const std::string& fileName) { ShowMessage("Report failure", "Can't write " + fileName); }
 
 }  // namespace
@@ -57,12 +51,19 @@ void WriteReportLine(ReportFile& report, const std::string& line) {
 void WriteReportText(ReportFile& report, const std::string& text) {
     if (report.file == 0) return;
     report.pending += text;
-    if (report.pending.size() >= ReportBlockSize) WritePending(report);
+    if (report.pending.size() >= ReportBlockSize) WritePendingText(report);
+}
+
+bool WritePendingText(ReportFile& report) {
+    if (!report.pending.empty() && !WriteBytes(report.file, report.pending.data(), report.pending.size()))
+        report.failed = true;
+    report.pending.clear();
+    return !report.failed;
 }
 
 bool FinishReport(ReportFile& report) {
     if (report.file == 0) return false;
-    WritePending(report);
+    WritePendingText(report);
     if (!CloseFile(report.file)) report.failed = true;
     report.file = 0;
     if (report.failed) {

@@ -25,6 +25,8 @@ std::string GetReportFolder();
 bool CreateReport(const std::string& fileName, ReportFile& report);
 void WriteReportLine(ReportFile& report, const std::string& line);  // followed by CR LF
 void WriteReportText(ReportFile& report, const std::string& text);  // no line end
+// Hands the buffered text to the file; false when any of the report's text failed to reach it.
+bool WritePendingText(ReportFile& report);
 // Closes the report and opens it in the viewer; when its text did not all reach the disk the user
 // is told instead and false comes back.
 bool FinishReport(ReportFile& report);
