@@ -10,6 +10,7 @@
 #include "shell/messages.h"
 #include "shell/progress_list.h"
 
+#include <string_view>
 #include <unordered_map>
 
 namespace {
@@ -40,14 +41,14 @@ struct MeshPathPlan {
     std::vector<int> unjudged;  // opened in every searched folder until found
 };
 
-// Whether a listing can show that the name is absent. Windows also opens other spellings of
-// these: "." and "..", trailing dots and blanks, short names, streams, wildcards, and letters beyond
-// ASCII whose case it folds.
+// Whether a listing can show that the name is absent. Windows opens other spellings of these: the
+// empty name of a doubled "\", "." and "..", trailing dots and blanks, short names, streams,
+// wildcards, and letters beyond ASCII whose case it folds.
 bool ListingDecides(const std::string& name) {
+    const std::string_view unlisted = "~:*?\"<>|";
     if (name.empty() || name.back() == '.' || name.back() == ' ') return false;
     for (char c : name)
-        if (static_cast<unsigned char>(c) >= 0x80 || std::string("~:*?\"<>|").find(c) != std::string::npos)
-            return false;
+        if (static_cast<unsigned char>(c) >= 0x80 || unlisted.find(c) != std::string_view::npos) return false;
     return true;
 }
 
