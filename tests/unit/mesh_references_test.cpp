@@ -27,6 +27,13 @@ Strings AfterSearchingLines(const Strings& lines) {
     return at == lines.end() ? Strings{} : Strings(at + 2, lines.end());
 }
 
+// A block of the missing-meshes output: the ruler, the object line, the section name, the mesh lines.
+Strings Block(int number, const std::string& house, const Strings& meshLines) {
+    Strings block = {Stars14, "Object (" + std::to_string(number) + ")", "buildings.House$" + house};
+    block.insert(block.end(), meshLines.begin(), meshLines.end());
+    return block;
+}
+
 }  // namespace
 
 TEST(MeshReferences, CutsTheValueFromItsFirst3do) {
@@ -205,66 +212,35 @@ TEST_F(CheckMeshReferencesTest, MissingModeListsEveryMeshAndReportsTheMissingOne
 
     EXPECT_EQ(CheckMeshReferences(ModsRoot(), "missing"), CommandResult::Findings);
 
-    EXPECT_EQ(AfterSearchingLines(ProgressLines()), Strings({"Check: ...\\mods\\.\\3do",
-                                                             "Check: ...\\mods\\..\\3do",
-                                                             "Check: ...\\mods\\ModA\\3do",
-                                                             "Check: ...\\mods\\ModB\\3do",
-                                                             " ",
-                                                             "//**************************",
-                                                             "Starting output",
-                                                             " ",
-                                                             Stars14,
-                                                             "Object (1)",
-                                                             "buildings.House$Both",
-                                                             "Not found: Mesh 3do\\Both\\mono.sim",
-                                                             Stars14,
-                                                             "Object (1)",
-                                                             "buildings.House$Both",
-                                                             "Not found: MeshLive 3do\\Both\\live.sim",
-                                                             Stars14,
-                                                             "Object (2)",
-                                                             "buildings.House$LiveOnly",
-                                                             "Found: MeshLive 3do\\L\\live.sim",
-                                                             "Not Found: MeshDead 3do\\L\\dead.sim",
-                                                             Stars14,
-                                                             "Object (3)",
-                                                             "buildings.House$NoneFound",
-                                                             "Not found: MeshLive 3do\\N\\live.sim",
-                                                             "Not Found: MeshDead 3do\\N\\dead.sim",
-                                                             Stars14,
-                                                             "Object (4)",
-                                                             "buildings.House$DeadOnly",
-                                                             "Not Found: MeshDead 3DO\\D\\dead.sim",
-                                                             Stars14,
-                                                             "Object (5)",
-                                                             "buildings.House$Fine",
-                                                             "Found: Mesh 3do\\F\\mono.sim",
-                                                             Stars14,
-                                                             "Object (5)",
-                                                             "buildings.House$Fine",
-                                                             "Found: MeshLive 3do\\F\\live.sim",
-                                                             "Found: MeshDead 3do\\F\\dead.sim"}));
-    EXPECT_EQ(Desktop("Missing_3do.txt"), MissingHeader + CrLf({Stars14,
-                                                                "Object (1)",
-                                                                "buildings.House$Both",
-                                                                "Not found: Mesh 3do\\Both\\mono.sim",
-                                                                Stars14,
-                                                                "Object (1)",
-                                                                "buildings.House$Both",
-                                                                "Not found: MeshLive 3do\\Both\\live.sim",
-                                                                Stars14,
-                                                                "Object (2)",
-                                                                "buildings.House$LiveOnly",
-                                                                "Not found: MeshDead 3do\\L\\dead.sim",
-                                                                Stars14,
-                                                                "Object (3)",
-                                                                "buildings.House$NoneFound",
-                                                                "Not found: MeshLive 3do\\N\\live.sim",
-                                                                "Not found: MeshDead 3do\\N\\dead.sim",
-                                                                Stars14,
-                                                                "Object (4)",
-                                                                "buildings.House$DeadOnly",
-                                                                "Not found: MeshDead 3DO\\D\\dead.sim"}));
+    Strings list = {"Check: ...\\mods\\.\\3do",
+                    "Check: ...\\mods\\..\\3do",
+                    "Check: ...\\mods\\ModA\\3do",
+                    "Check: ...\\mods\\ModB\\3do",
+                    " ",
+                    "//**************************",
+                    "Starting output",
+                    " "};
+    for (const Strings& block :
+         {Block(1, "Both", {"Not found: Mesh 3do\\Both\\mono.sim"}),
+          Block(1, "Both", {"Not found: MeshLive 3do\\Both\\live.sim"}),
+          Block(2, "LiveOnly", {"Found: MeshLive 3do\\L\\live.sim", "Not Found: MeshDead 3do\\L\\dead.sim"}),
+          Block(3, "NoneFound",
+                {"Not found: MeshLive 3do\\N\\live.sim", "Not Found: MeshDead 3do\\N\\dead.sim"}),
+          Block(4, "DeadOnly", {"Not Found: MeshDead 3DO\\D\\dead.sim"}),
+          Block(5, "Fine", {"Found: Mesh 3do\\F\\mono.sim"}),
+          Block(5, "Fine", {"Found: MeshLive 3do\\F\\live.sim", "Found: MeshDead 3do\\F\\dead.sim"})})
+        list.insert(list.end(), block.begin(), block.end());
+    EXPECT_EQ(AfterSearchingLines(ProgressLines()), list);
+    Strings report;
+    for (const Strings& block :
+         {Block(1, "Both", {"Not found: Mesh 3do\\Both\\mono.sim"}),
+          Block(1, "Both", {"Not found: MeshLive 3do\\Both\\live.sim"}),
+          Block(2, "LiveOnly", {"Not found: MeshDead 3do\\L\\dead.sim"}),
+          Block(3, "NoneFound",
+                {"Not found: MeshLive 3do\\N\\live.sim", "Not found: MeshDead 3do\\N\\dead.sim"}),
+          Block(4, "DeadOnly", {"Not found: MeshDead 3DO\\D\\dead.sim"})})
+        report.insert(report.end(), block.begin(), block.end());
+    EXPECT_EQ(Desktop("Missing_3do.txt"), MissingHeader + CrLf(report));
     ASSERT_EQ(HeadlessProcesses().size(), 1u);
     EXPECT_EQ(HeadlessProcesses()[0].commandLine, "\"C:\\WINDOWS\\notepad.exe\" Missing_3do.txt");
     EXPECT_EQ(Messages(), Strings{});
