@@ -67,6 +67,14 @@ if cmake -S . -B build/mingw -DCMAKE_TOOLCHAIN_FILE=cmake/mingw-w64.cmake -DCMAK
         -DVERRANT_WERROR=ON >"$logs/mingw-configure.log" 2>&1 &&
     cmake --build build/mingw -j"$jobs" >"$logs/mingw-build.log" 2>&1; then
     pass "MinGW build"
+    # verrant.exe must run on a bare Windows: only system DLLs in its import table.
+    imports=$(x86_64-w64-mingw32-objdump -p build/mingw/src/verrant.exe 2>/dev/null | sed -n 's/^\s*DLL Name: //p')
+    foreign=$(echo "$imports" | grep -viE '^(kernel32|user32|gdi32|comctl32|shell32|ole32|oleaut32|advapi32|comdlg32|shlwapi|version|msvcrt|ucrtbase|api-ms-win-[a-z0-9-]+)\.dll$')
+    if [ -n "$imports" ] && [ -z "$foreign" ]; then
+        pass "verrant.exe imports system DLLs only ($(echo $imports | tr ' ' ','))"
+    else
+        fail "verrant.exe imports: ${foreign:-none found}"
+    fi
 else
     fail "MinGW build (see $logs/mingw-build.log)"
     tail -n 30 "$logs/mingw-build.log"

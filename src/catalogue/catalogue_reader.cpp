@@ -22,7 +22,10 @@ bool Refill(CatalogueReader& reader) {
     reader.buffer.resize(ReadBlockSize);
     reader.filled = ReadBytes(reader.file, reader.buffer.data(), reader.buffer.size());
     reader.position = 0;
-    if (reader.filled == 0) reader.exhausted = true;
+    if (reader.filled == 0) {
+        reader.exhausted = true;
+        reader.failed = ReadHasFailed(reader.file);
+    }
     return reader.filled > 0;
 }
 

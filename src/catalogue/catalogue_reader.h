@@ -12,6 +12,7 @@ struct CatalogueReader {
     std::size_t position = 0;
     std::size_t filled = 0;
     bool exhausted = false;  // the file gave its last byte
+    bool failed = false;     // a read failed: what came before is not the whole file
 };
 
 // Makes the folder current and opens the catalogue there by its bare name.

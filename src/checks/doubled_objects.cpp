@@ -1,6 +1,6 @@
 #include "checks/doubled_objects.h"
 
-#include "catalogue/catalogue_reader.h"
+#include "checks/catalogue_opening.h"
 #include "location/catalogue_folder.h"
 #include "shell/app_state.h"
 #include "shell/messages.h"
@@ -44,10 +44,7 @@ CommandResult FindDoubledObjects() {
     EnsureCatalogueFolder();
     if (CatalogueFolder.empty()) return CommandResult::NoFolder;
     CatalogueReader reader;
-    if (!OpenCatalogue(CatalogueFolder, reader)) {
-        ShowMessage("static.ini failure", "Can't open static.ini");
-        return CommandResult::Failed;
-    }
+    if (!OpenCatalogueForCheck(CatalogueFolder, reader)) return CommandResult::Failed;
     if (ProgressListOn) ClearProgressList();
 
     std::vector<std::string> names;
@@ -79,10 +76,7 @@ CommandResult FindDoubledObjects() {
         ShowMessage("No doubled objects", "No doubled objects found in your static.ini");
         return CommandResult::NothingFound;
     }
-    ReportFile report;
-    if (!CreateReport("Doubled_objects.txt", report)) return CommandResult::Failed;
-    WriteReportLine(report, "Doubled objects in your static.ini:");
-    WriteReportLine(report, "");
-    for (const DoubledObject& doubled : doubles) WriteReportLine(report, DoubledObjectLine(doubled));
-    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+    std::vector<std::string> findings;
+    for (const DoubledObject& doubled : doubles) findings.push_back(DoubledObjectLine(doubled));
+    return WriteFindingsReport("Doubled_objects.txt", "Doubled objects in your static.ini:", findings);
 }

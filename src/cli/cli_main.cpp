@@ -3,7 +3,10 @@
 // rewritten, or the list written), 1 findings, 2 bad usage or a catalogue or report that could not
 // be read or written.
 #include "checks/doubled_objects.h"
+#include "checks/empty_references.h"
+#include "checks/irregular_entries.h"
 #include "checks/mesh_references.h"
+#include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
 #include "location/derived_paths.h"
 #include "platform/headless/headless.h"
@@ -14,7 +17,6 @@
 #include "shell/progress_list.h"
 
 #include <cstdio>
-#include <filesystem>
 #include <functional>
 
 namespace {
@@ -41,6 +43,12 @@ CommandResult WithModsRoot(const std::string& mode) {
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
+    {"irregular-entries", "lines that begin with none of the known prefixes",
+     [](const CliOptions&) { return CheckIrregularEntries(); }},
+    {"empty-references", "Mesh, MeshLive and MeshDead lines without a value",
+     [](const CliOptions&) {
+         return EnsureCatalogueFolderKnown() ? FindEmptyReferences(CatalogueFolder) : CommandResult::NoFolder;
+     }},
     {"renumber", "rewrites static.ini with a number line above every building header",
      [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "renumber"); }},
     {"denumber", "rewrites static.ini without its number lines",
@@ -49,6 +57,7 @@ const CliCommand Commands[] = {
      [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb"); }},
     {"fmb-plus-list", "object list for FMB+, with plates (Static_list_FMBplus.txt)",
      [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb+"); }},
+    {"missing-objects", "objects a map (--map FILE) places that the catalogue lacks", RunMissingObjectsCommand},
     {"wrong-sim-references", "mesh files that no 3do folder of a mod holds",
      [](const CliOptions&) { return WithModsRoot("missing"); }},
     {"doubled-used-sims", "objects whose MeshLive and MeshDead are the same file",
@@ -63,6 +72,7 @@ void PrintHelp(std::FILE* to) {
                  "  --catalogue DIR   the folder that holds static.ini\n"
                  "  --report-dir DIR  where the report is written (default: the current folder)\n"
                  "  --progress        print the progress list's lines to standard output\n"
+                 "  --map FILE        missing-objects: the map file; without --catalogue, its tree's catalogue\n"
                  "commands:\n");
     for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
     std::fprintf(to, "exit status: 0 nothing found, catalogue rewritten or list written; 1 findings reported;\n"
@@ -103,8 +113,8 @@ int main(int argc, char** argv) {
     StartFolder = ProgramFolder(".");
     if (!options.catalogue.empty()) CatalogueFolder = ProgramFolder(options.catalogue);
     std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
-    std::error_code fsError;
-    if (!std::filesystem::is_directory(reportDir, fsError)) {
+    // Through the file layer, so that the folder's name matches as the catalogue's does.
+    if (!MakeFolderCurrent(ProgramFolder(reportDir))) {
         std::fprintf(stderr, "verrant-cli: report folder %s does not exist\n", reportDir.c_str());
         return ExitTrouble;
     }

@@ -10,7 +10,8 @@
 
 using Handle = std::uintptr_t;  // a window, control, menu or open file; 0 means none
 
-// Once at start: common controls (version 6, as the manifest asks) and COM single-threaded.
+// Once at start: common controls (version 6, as the manifest asks), COM single-threaded, and no
+// critical-error boxes (a drive that is not ready just fails).
 void InitPlatform();
 
 //--- windows
@@ -111,6 +112,8 @@ Handle OpenForReading(const std::string& name);
 Handle CreateForWriting(const std::string& name);
 // Bytes read into buffer; 0 at the end of the file or on a failure.
 std::size_t ReadBytes(Handle file, char* buffer, std::size_t size);
+// Whether a read of this file failed: tells a failure from the end of the file.
+bool ReadHasFailed(Handle file);
 bool WriteBytes(Handle file, const char* data, std::size_t size);
 // Writes everything out to the disk before returning.
 bool FlushToDisk(Handle file);

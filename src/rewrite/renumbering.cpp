@@ -78,11 +78,14 @@ CommandResult RenumberCatalogue(const std::string& catalogueFolder, const std::s
     temporary.fileName = TemporaryName;
     temporary.file = CreateForWriting(TemporaryName);
     bool written = temporary.file != 0 && WriteRewrittenCatalogue(catalogue, temporary, numbering);
+    // A catalogue that could not be read to its end must not be replaced by the part that was.
+    bool readWhole = !catalogue.failed;
     CloseCatalogue(catalogue);
     if (temporary.file != 0) {
         written = written && FlushToDisk(temporary.file);
         written = CloseFile(temporary.file) && written;
     }
+    if (!readWhole) return TellRewriteFailure("Can't read static.ini");
     if (!written) return TellRewriteFailure("Can't write static.ini.tmp");
     if (numbering && ProgressListOn) ShowNumbering(catalogueFolder);
     if (!ReplaceFileWith("static.ini", TemporaryName)) return TellRewriteFailure("Can't replace static.ini");

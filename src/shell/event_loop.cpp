@@ -1,8 +1,13 @@
 #include "shell/event_loop.h"
 
 #include "checks/doubled_objects.h"
+#include "checks/empty_references.h"
+#include "checks/irregular_entries.h"
 #include "location/catalogue_folder.h"
 #include "location/settings.h"
+#include "maps/missing_objects_window.h"
+#include "rewrite/mission_builder_list.h"
+#include "rewrite/renumbering.h"
 #include "platform/platform.h"
 #include "shell/app_state.h"
 #include "shell/main_window.h"
@@ -13,8 +18,17 @@ namespace {
 
 void RunMenuCommand(int id) {
     switch (id) {
+        case MenuMissingObjects:
+            ShowMissingObjectsWindow(MapsPattern);
+            break;
         case MenuDoubledObjects:
             FindDoubledObjects();
+            break;
+        case MenuIrregularEntries:
+            CheckIrregularEntries();
+            break;
+        case MenuEmptyReferences:
+            if (EnsureCatalogueFolderKnown()) FindEmptyReferences(CatalogueFolder);
             break;
         case MenuSavePath:
             if (EnsureCatalogueFolderKnown()) SavePath(CatalogueFolder, StartFolder);
@@ -22,16 +36,21 @@ void RunMenuCommand(int id) {
         case MenuClearPath:
             ClearPath();
             break;
+        case MenuRenumber:
+            if (EnsureCatalogueFolderKnown()) RenumberCatalogue(CatalogueFolder, "renumber");
+            break;
+        case MenuDenumber:
+            if (EnsureCatalogueFolderKnown()) RenumberCatalogue(CatalogueFolder, "denumber");
+            break;
+        case MenuListForFmb:
+            if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb");
+            break;
+        case MenuListForFmbPlus:
+            if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb+");
+            break;
         // Commands whose procedures come with their own units: one line each above when they land.
-        case MenuMissingObjects:
-        case MenuIrregularEntries:
         case MenuWrongSimReferences:
         case MenuDoubledUsedSims:
-        case MenuEmptyReferences:
-        case MenuRenumber:
-        case MenuDenumber:
-        case MenuListForFmb:
-        case MenuListForFmbPlus:
             break;
         case MenuCredit:
             break;

@@ -74,6 +74,16 @@ bool FinishReport(ReportFile& report) {
     return true;
 }
 
+CommandResult WriteFindingsReport(const std::string& fileName, const std::string& heading,
+                                  const std::vector<std::string>& findings) {
+    ReportFile report;
+    if (!CreateReport(fileName, report)) return CommandResult::Failed;
+    WriteReportLine(report, heading);
+    WriteReportLine(report, "");
+    for (const std::string& finding : findings) WriteReportLine(report, finding);
+    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+}
+
 void OpenReportInViewer(const std::string& fileName) { StartTextViewer(fileName, GetReportFolder()); }
 
 bool StartTextViewer(const std::string& fileName, const std::string& workingFolder) {

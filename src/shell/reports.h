@@ -2,8 +2,10 @@
 #pragma once
 
 #include "platform/platform.h"
+#include "shell/command_result.h"
 
 #include <string>
+#include <vector>
 
 struct ReportFile {
     Handle file = 0;
@@ -30,6 +32,11 @@ bool WritePendingText(ReportFile& report);
 // Closes the report and opens it in the viewer; when its text did not all reach the disk the user
 // is told instead and false comes back.
 bool FinishReport(ReportFile& report);
+
+// The usual report: the heading, an empty line and the findings, then the viewer. Findings when
+// it all reached the disk; Failed, with the user told, when not.
+CommandResult WriteFindingsReport(const std::string& fileName, const std::string& heading,
+                                  const std::vector<std::string>& findings);
 
 void OpenReportInViewer(const std::string& fileName);
 bool StartTextViewer(const std::string& fileName, const std::string& workingFolder);

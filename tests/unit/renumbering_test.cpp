@@ -156,18 +156,21 @@ TEST_F(RenumberCatalogueTest, FailuresLeaveTheCatalogueAsItWas) {
         HeadlessFileFaults faults;
         std::string message;
     };
-    HeadlessFileFaults createFails, firstWriteFails, laterWriteFails, replaceFails;
+    HeadlessFileFaults createFails, firstWriteFails, laterWriteFails, replaceFails, readFails;
     createFails.failCreate = "static.ini.tmp";
     firstWriteFails.failWriteName = laterWriteFails.failWriteName = "STATIC.INI.TMP";
     firstWriteFails.failWriteAfterBytes = 10;
     laterWriteFails.failWriteAfterBytes = 100000;
     replaceFails.failReplace = true;
+    readFails.failReadName = "static.ini";
+    readFails.failReadAfterBytes = 70000;
     const std::string cannotWrite = "static.ini failure: Can't write static.ini.tmp";
     const std::vector<Case> cases = {
         {"create fails", createFails, cannotWrite},
         {"first write fails", firstWriteFails, cannotWrite},
         {"a later write fails", laterWriteFails, cannotWrite},
-        {"replace fails", replaceFails, "static.ini failure: Can't replace static.ini"}};
+        {"replace fails", replaceFails, "static.ini failure: Can't replace static.ini"},
+        {"a read fails halfway", readFails, "static.ini failure: Can't read static.ini"}};
     std::string catalogue;
     for (int i = 0; i < 8000; ++i)
         catalogue += "(" + std::to_string(i) + ")\n[buildings.House$N" + std::to_string(i) + "]\n";

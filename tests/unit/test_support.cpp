@@ -2,6 +2,7 @@
 
 #include "platform/headless/headless.h"
 #include "shell/app_state.h"
+#include "shell/progress_list.h"
 
 #include <filesystem>
 #include <fstream>
@@ -11,7 +12,8 @@ namespace fs = std::filesystem;
 
 void ScratchTest::SetUp() {
     const ::testing::TestInfo* info = ::testing::UnitTest::GetInstance()->current_test_info();
-    root = (fs::temp_directory_path() / "verrant-tests" / info->test_suite_name() / info->name()).string();
+    // Inside the build tree: suites of other build trees may run at the same time.
+    root = (fs::path(VERRANT_SCRATCH_DIR) / info->test_suite_name() / info->name()).string();
     fs::remove_all(root);
     fs::create_directories(root + "/Desktop");
     HeadlessReset();
@@ -60,6 +62,17 @@ Strings ScratchTest::Messages() const {
     Strings shown;
     for (const ShownMessage& message : HeadlessMessages()) shown.push_back(message.title + ": " + message.text);
     return shown;
+}
+
+void ScratchTest::SwitchListOn() {
+    ProgressListOn = true;
+    OpenProgressList();
+    AddProgressLine("left over from an earlier check");
+}
+
+void ScratchTest::Restart() {
+    TearDown();
+    SetUp();
 }
 
 std::string CrLf(const Strings& lines) {

@@ -54,6 +54,8 @@ struct StartedProcess {
 struct HeadlessFileFaults {
     std::string failOpen;                   // OpenForReading of this name fails
     std::string failCreate;                 // CreateForWriting of this name fails
+    std::string failReadName;               // reads of this file fail once ...
+    long long failReadAfterBytes = -1;      // ... this many bytes have been read
     std::string failWriteName;              // writes to this file fail once ...
     long long failWriteAfterBytes = -1;     // ... this many bytes have been written
     bool failReplace = false;               // ReplaceFileWith fails

@@ -22,6 +22,8 @@ struct OpenFile {
     std::FILE* stream = nullptr;
     std::string bareName;
     long long written = 0;
+    long long read = 0;
+    bool readFailed = false;
 };
 
 std::map<Handle, OpenFile> Files;
@@ -207,7 +209,21 @@ Handle CreateForWriting(const std::string& name) {
 
 std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
     OpenFile* file = FindFile(handle);
-    return file ? std::fread(buffer, 1, size, file->stream) : 0;
+    if (!file || file->readFailed) return 0;
+    if (Faults.failReadAfterBytes >= 0 && SameIgnoringCase(file->bareName, Faults.failReadName) &&
+        file->read + static_cast<long long>(size) > Faults.failReadAfterBytes) {
+        size = static_cast<std::size_t>(std::max(0LL, Faults.failReadAfterBytes - file->read));
+        file->readFailed = size == 0;
+    }
+    std::size_t done = std::fread(buffer, 1, size, file->stream);
+    file->read += static_cast<long long>(done);
+    if (std::ferror(file->stream)) file->readFailed = true;
+    return done;
+}
+
+bool ReadHasFailed(Handle handle) {
+    OpenFile* file = FindFile(handle);
+    return file && file->readFailed;
 }
 
 bool WriteBytes(Handle handle, const char* data, std::size_t size) {

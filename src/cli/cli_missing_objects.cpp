@@ -1,0 +1,41 @@
+#include "cli/cli_missing_objects.h"
+
+#include "catalogue/text.h"
+#include "location/catalogue_folder.h"
+#include "location/catalogue_from_map.h"
+#include "maps/missing_map_objects.h"
+#include "maps/missing_objects_window.h"
+#include "platform/headless/headless.h"
+#include "shell/app_state.h"
+
+#include <cstdio>
+
+CommandResult RunMissingObjectsCommand(const CliOptions& options) {
+    if (options.map.empty()) {
+        std::fprintf(stderr, "verrant-cli: missing-objects needs --map FILE\n");
+        return CommandResult::Failed;
+    }
+    // The file name stays as the user wrote it: only "static.ini" itself is refused unread.
+    std::string path = HeadlessProgramPath(options.map);
+    std::size_t slash = path.rfind('\\');
+    std::string mapFolder = path.substr(0, slash + 1);
+    std::string selection = mapFolder + "*" + path.substr(slash + 1);
+    if (!ValidateMapFile(0, selection)) return CommandResult::Failed;
+
+    if (CatalogueFolder.empty()) {
+        CatalogueFolder = DeriveCatalogueFolderFromMap(selection);
+        // Without a "mod" in the path the folder is relative, as the desktop program takes it: to
+        // the map's folder, which the validation left current.
+        bool absolute = StartsWith(CatalogueFolder, "\\") || CatalogueFolder.compare(1, 1, ":") == 0;
+        if (!absolute) CatalogueFolder = mapFolder + CatalogueFolder;
+        if (!FolderHoldsCatalogue(CatalogueFolder)) {
+            std::fprintf(stderr, "static.ini not found: %s\n", HeadlessHostPath(CatalogueFolder).c_str());
+            return CommandResult::Failed;
+        }
+    } else if (!FolderHoldsCatalogue(CatalogueFolder)) {
+        // The desktop program says nothing here, as its folder was found a moment before.
+        std::fprintf(stderr, "static.ini failure: Can't open static.ini\n");
+        return CommandResult::Failed;
+    }
+    return FindMissingMapObjects(selection, CatalogueFolder);
+}

@@ -1,0 +1,80 @@
+#include "maps/missing_map_objects.h"
+
+#include "catalogue/catalogue_reader.h"
+#include "maps/map_file.h"
+#include "shell/app_state.h"
+#include "shell/messages.h"
+#include "shell/progress_list.h"
+#include "shell/reports.h"
+
+#include <string_view>
+#include <unordered_map>
+
+// One index of first ordinals gives the numbers of a walk from the first header, without
+// walking the headers once per name.
+std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames,
+                                      const std::vector<std::string>& sectionNames) {
+    std::unordered_map<std::string_view, int> firstOrdinal;
+    firstOrdinal.reserve(sectionNames.size());
+    for (std::size_t i = 0; i < sectionNames.size(); ++i)
+        firstOrdinal.try_emplace(sectionNames[i], static_cast<int>(i));
+    std::vector<int> ordinals;
+    ordinals.reserve(mapNames.size());
+    for (const std::string& name : mapNames) {
+        auto found = firstOrdinal.find(name);
+        ordinals.push_back(found == firstOrdinal.end() ? NotInCatalogue : found->second);
+    }
+    return ordinals;
+}
+
+bool ReadSectionNames(const std::string& catalogueFolder, std::vector<std::string>& sectionNames) {
+    sectionNames.clear();
+    CatalogueReader reader;
+    if (!OpenCatalogue(catalogueFolder, reader)) return false;
+    std::string line;
+    while (NextCatalogueLine(reader, line))
+        if (IsBuildingHeader(line)) sectionNames.push_back(SectionNameByBracket(line));
+    CloseCatalogue(reader);
+    return true;
+}
+
+CommandResult FindMissingMapObjects(const std::string& selection, const std::string& catalogueFolder) {
+    std::string folder, fileName;
+    SplitMapFileSelection(selection, folder, fileName);
+    std::vector<std::string> mapNames = ExtractMapObjectNames(ReadMapFileText(folder, fileName));
+    DrainPendingEvents();
+
+    std::vector<std::string> sectionNames;
+    if (!ReadSectionNames(catalogueFolder, sectionNames)) return CommandResult::Failed;
+    DrainPendingEvents();
+    if (ProgressListOn) ClearProgressList();
+
+    std::vector<int> ordinals = FirstSectionOrdinals(mapNames, sectionNames);
+    std::vector<std::string> missing;
+    for (std::size_t i = 0; i < mapNames.size(); ++i) {
+        if (ordinals[i] != NotInCatalogue && ProgressListOn) {
+            DrainPendingEvents();
+            AddProgressLine("Found object (" + std::to_string(ordinals[i]) + "): " + mapNames[i]);
+        }
+        DrainPendingEvents();
+        if (ordinals[i] == NotInCatalogue) {
+            missing.push_back(mapNames[i]);
+            if (ProgressListOn) AddProgressLine("Missing: " + mapNames[i]);
+        }
+    }
+    if (ProgressListOn) {
+        AddProgressLine("");
+        AddProgressLine("Total number of objects: " + std::to_string(mapNames.size()));
+    }
+
+    if (missing.empty()) {
+        ShowMessage("No missing objects found", "All maps objects found in your static.ini");
+        return CommandResult::NothingFound;
+    }
+    ReportFile report;
+    if (!CreateReport("Missing_objects.txt", report)) return CommandResult::Failed;
+    WriteReportLine(report, "Missing objects in your static.ini:");
+    WriteReportLine(report, "");
+    for (const std::string& name : missing) WriteReportLine(report, name);
+    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+}

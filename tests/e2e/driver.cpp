@@ -1,0 +1,504 @@
+// The end-to-end driver: starts verrant.exe under Wine in fresh start folders and works it through
+// its windows as a user would. Prints one line per scenario and ends with "N passed, M failed".
+//   e2e_driver.exe PROGRAM PROBE_DLL WORK_FOLDER [SHOTS_FOLDER]
+#include "driver_support.h"
+
+#include <algorithm>
+#include <cstdio>
+#include <functional>
+
+namespace {
+
+const std::string CatalogueTail = "mods\\std\\com\\maddox\\il2\\objects\\";
+const std::string Ruler(67, '*');
+
+std::string Work(const std::string& relative) { return Settings.workRoot + relative; }
+std::string TreeCatalogue() { return Work("tree\\" + CatalogueTail); }
+std::string CleanCatalogue() { return Work("clean\\" + CatalogueTail); }
+
+std::string Headers(const Strings& names) {
+    std::string text = "[***]\r\nTitle Houses\r\n";
+    for (const std::string& name : names)
+        text += "[buildings.House$" + name + "]\r\nMesh 3do/Buildings/x/live.sim\r\n";
+    return text;
+}
+
+// Forty objects, two of them doubled: more lines than the progress list shows at once.
+Strings TreeNames() {
+    Strings names;
+    for (int i = 0; i < 40; ++i) names.push_back("Object" + std::to_string(i));
+    names[5] = names[17] = "Dup1";
+    names[20] = names[33] = "Dup2";
+    return names;
+}
+
+void MakeFixtures() {
+    MakeFolders(TreeCatalogue());
+    WriteBytes(TreeCatalogue() + "static.ini", Headers(TreeNames()));
+    MakeFolders(CleanCatalogue());
+    WriteBytes(CleanCatalogue() + "static.ini", Headers({"A", "a", "B"}));
+    MakeFolders(Work("empty"));
+    MakeFolders(Work("gone"));
+}
+
+// A start folder of its own for each program run, optionally with a settings file.
+std::string FreshStartFolder(const std::string& name, const std::string* settings = nullptr) {
+    std::string folder = Work("start\\" + name + "\\");
+    MakeFolders(folder);
+    DeleteFileA((folder + "verrant.ini").c_str());
+    if (settings) WriteBytes(folder + "verrant.ini", *settings);
+    return folder;
+}
+
+std::vector<double> StartTimes;
+
+Program Start(const std::string& startFolder) {
+    Program program = StartProgram(startFolder);
+    StartTimes.push_back(program.startMilliseconds);
+    return program;
+}
+
+void ExpectPlace(HWND control, int left, int top, int width, int height, const std::string& what) {
+    RECT place = ChildPlace(control);
+    Expect(place.left == left && place.top == top && place.right == width && place.bottom == height,
+           what + " at " + std::to_string(place.left) + "," + std::to_string(place.top) + " size " +
+               std::to_string(place.right) + "x" + std::to_string(place.bottom));
+}
+
+void ExpectFrame(HWND window, int left, int top, int clientWidth, int clientHeight, const std::string& what) {
+    RECT actual, expected = ExpectedFrame(window, left, top, clientWidth, clientHeight);
+    GetWindowRect(window, &actual);
+    Expect(EqualRect(&actual, &expected) != FALSE,
+           what + " frame at " + std::to_string(actual.left) + "," + std::to_string(actual.top) + " size " +
+               std::to_string(actual.right - actual.left) + "x" + std::to_string(actual.bottom - actual.top));
+}
+
+void ExpectStyle(HWND window, bool systemMenu, bool sizingBorder, const std::string& what) {
+    LONG style = GetWindowLongA(window, GWL_STYLE);
+    Expect((style & WS_CAPTION) == WS_CAPTION, what + " has a title bar");
+    Expect(((style & WS_SYSMENU) != 0) == systemMenu,
+           what + (systemMenu ? " has" : " has no") + " system menu");
+    Expect(((style & WS_THICKFRAME) != 0) == sizingBorder,
+           what + (sizingBorder ? " has" : " has no") + " sizing border");
+    Expect((style & (WS_MINIMIZEBOX | WS_MAXIMIZEBOX)) == 0, what + " has no minimize or maximize box");
+}
+
+// Every caption must fit its control in the font the control uses, and no control may use the
+// bold system font.
+void ExpectCaptionsFit(Program& program, HWND window, const std::string& what) {
+    for (const std::string& line : SplitLines(Probe(program, window, ProbeCaptions))) {
+        Strings fields = SplitTabs(line);
+        if (fields.size() < 4 || fields[0].empty()) continue;
+        Expect(fields[3] != "(system font)" && fields[3] != "System",
+               what + ": \"" + fields[0] + "\" has a normal font");
+        Expect(std::stoi(fields[1]) + 4 <= std::stoi(fields[2]),  // two pixels of border on each side
+               what + ": \"" + fields[0] + "\" needs " + fields[1] + " of " + fields[2] + " pixels");
+    }
+}
+
+HWND Control(HWND window, const char* windowClass, int index = 0) {
+    HWND child = nullptr;
+    for (int i = 0; i <= index; ++i) child = FindWindowExA(window, child, windowClass, nullptr);
+    return child;
+}
+
+HWND ProgressList(HWND window) { return Control(window, "ListBox"); }
+
+void AnswerStartQuestion(const Program& program) {
+    ConfirmMessage(program, "Path to static.ini",
+                   "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first");
+}
+
+HWND ChooserWindow(const Program& program) {
+    HWND chooser = WaitForWindow(program, "Searching static.ini");
+    Require(chooser != nullptr, "the chooser \"Searching static.ini\" opens");
+    return chooser;
+}
+
+std::string ChooserPath(HWND chooser) { return WindowText(Control(chooser, "Edit")); }
+
+bool WaitForChooserPath(HWND chooser, const std::string& path) {
+    for (int waited = 0; ChooserPath(chooser) != path; waited += 20) {
+        if (waited > 5000) return false;
+        Pause(20);
+    }
+    return true;
+}
+
+// Walks the chooser's browser from the top level down to a folder, opening each step by Enter
+// (or the first by a double click), and checks the path box at every step.
+void BrowseTo(Program& program, HWND chooser, const std::string& folder) {
+    std::string reached;
+    std::size_t start = 0;
+    bool first = true;
+    while (start < folder.size()) {
+        std::size_t slash = folder.find('\\', start);
+        std::string name = folder.substr(start, slash - start);
+        std::string row = first ? name + "\\" : name;
+        reached += name + "\\";
+        OpenBrowserRow(program, chooser, row, first);
+        Require(WaitForChooserPath(chooser, reached), "the path box shows " + reached + " after opening " +
+                                                          row + " (it shows \"" + ChooserPath(chooser) +
+                                                          "\")");
+        start = slash + 1;
+        first = false;
+    }
+}
+
+long Finish(Program& program) {
+    long code = WaitForExit(program, 5000);
+    StopProgram(program);
+    return code;
+}
+
+//--- scenarios
+
+// First start without a settings file: the question, the chooser, and closing it.
+void FirstStartAndMainWindow() {
+    Program program = Start(FreshStartFolder("first"));
+    MessageBoxSeen question = WaitForMessageBox(program);
+    Expect(IsWindowVisible(program.main) != FALSE, "the main window is visible during the start question");
+    ExpectText(question.title, "Path to static.ini", "start question title");
+    ExpectText(question.text, "Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first",
+               "start question");
+    Expect(!question.hasIcon, "the start question has no icon");
+    Expect(question.owner == program.main, "the start question is owned by the main window");
+    DismissMessageBox(question);
+
+    HWND chooser = ChooserWindow(program);
+    ExpectFrame(chooser, 300, 320, 324, 365, "chooser");
+    ExpectStyle(chooser, true, true, "chooser");
+    HWND label = Control(chooser, "Static");
+    ExpectText(WindowText(label), "Select folder with static.ini ", "chooser label");
+    ExpectPlace(Control(chooser, "SysListView32"), 10, 30, 304, 250, "chooser browser");
+    HWND pathBox = Control(chooser, "Edit");
+    ExpectPlace(pathBox, 10, 300, 304, 20, "chooser path box");
+    Expect((GetWindowLongA(pathBox, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) != 0, "the path box is sunken");
+    ExpectText(WindowText(pathBox), "", "chooser path box at first");
+    HWND ok = Control(chooser, "Button");
+    ExpectText(WindowText(ok), "OK", "chooser button");
+    ExpectPlace(ok, 289, 330, 25, 25, "chooser OK");
+    Strings rows = SplitLines(Probe(program, chooser, ProbeRows));
+    ExpectText(rows.empty() ? "" : rows[0], "columns\tName\tType\tModified", "browser columns");
+    Strings names = BrowserRowNames(program, chooser);
+    Expect(std::find(names.begin(), names.end(), "C:\\") != names.end(), "the top level shows drive C:");
+    Expect(std::find(names.begin(), names.end(), "Documents") != names.end(),
+           "the top level shows Documents");
+    ExpectCaptionsFit(program, chooser, "chooser");
+    Screenshot("chooser-top-level");
+    OpenBrowserRow(program, chooser, "C:\\", false);
+    WaitForChooserPath(chooser, "C:\\");
+    Screenshot("chooser");
+    PressCloseBox(chooser);
+    Expect(WaitUntilGone(chooser), "the close box closes the chooser");
+    Pause(300);
+    Expect(!MessageBoxShown(program), "closing the chooser shows no message");
+    Expect(!FileExists(Work("start\\first\\verrant.ini")), "closing the chooser saves nothing");
+
+    ExpectFrame(program.main, 250, 250, 270, 110, "main window");
+    ExpectStyle(program.main, true, true, "main window");
+    RECT client = ClientSize(program.main);
+    Strings menu = SplitLines(Probe(program, program.main, ProbeMenu));
+    Require(!menu.empty() && menu[0].rfind("bar\t", 0) == 0, "the main window has a menu bar");
+    int barHeight = std::stoi(SplitTabs(menu[0]).at(1));
+    Expect(client.right == 270, "main client width 270, is " + std::to_string(client.right));
+    Expect(barHeight > 0 && client.bottom < 110 && client.bottom >= 110 - 2 * barHeight,
+           "the menu bar (" + std::to_string(barHeight) + ") takes its height out of 110: client height " +
+               std::to_string(client.bottom));
+    HWND open = Control(program.main, "Button", 0), toggle = Control(program.main, "Button", 1);
+    ExpectText(WindowText(open), "Open static.ini", "first button");
+    ExpectPlace(open, 5, 15, 80, 22, "\"Open static.ini\"");
+    ExpectText(WindowText(toggle), "List searching", "second button");
+    ExpectPlace(toggle, 5, 50, 80, 22, "\"List searching\"");
+    Expect((GetWindowLongA(toggle, GWL_STYLE) & (BS_PUSHLIKE | 0xF)) == (BS_PUSHLIKE | BS_AUTOCHECKBOX),
+           "\"List searching\" is a push-like toggle");
+    ExpectCaptionsFit(program, program.main, "main window");
+
+    std::vector<std::string> items(menu.begin() + 1, menu.end());
+    Require(!items.empty(), "the menu has items");
+    Strings credit = SplitTabs(items.back());
+    Expect(credit.size() == 5 && credit[0] == "1" && credit[1] == "item" && credit[2] == "13" &&
+               !credit[4].empty() && credit[4].find('\t') == std::string::npos,
+           "the last item is the credit item, id 13 under \"?\": " + items.back());
+    items.back() = "1\titem\t13\tenabled\t(credit)";
+    for (std::string& item : items)
+        if (item.rfind("1\tseparator", 0) == 0) item = "1\tseparator";
+    ExpectLines(items,
+                {"0\tsub\t0\tenabled\tFile",
+                 "1\titem\t1\tenabled\tClose",
+                 "0\tsub\t0\tenabled\tSearch",
+                 "1\titem\t2\tenabled\t.. missing objects",
+                 "1\titem\t3\tenabled\t.. doubled objects",
+                 "1\titem\t4\tenabled\t.. irregular entrys",
+                 "1\tseparator",
+                 "1\tsub\t0\tenabled\t.. reference stuff",
+                 "2\titem\t5\tenabled\t.. wrong sim references",
+                 "2\titem\t14\tenabled\t.. doubled used sims",
+                 "2\titem\t15\tenabled\t.. empty references",
+                 "0\tsub\t0\tenabled\tNumeration",
+                 "1\titem\t6\tenabled\tRenumber static.ini",
+                 "1\titem\t7\tenabled\tDenumber static.ini",
+                 "0\tsub\t0\tenabled\tCreate",
+                 "1\titem\t8\tenabled\t.. objects list for FMB",
+                 "1\titem\t9\tenabled\t.. objects list for FMB+",
+                 "0\tsub\t0\tenabled\tPath",
+                 "1\titem\t11\tenabled\tSave path to static.ini/maps folder",
+                 "1\titem\t12\tenabled\tClear path to static.ini/maps folder",
+                 "0\tsub\t0\tenabled\t?",
+                 "1\titem\t13\tenabled\t(credit)"},
+                "menu table");
+    Screenshot("main-window");
+
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "\"Close\" ends the program with exit code 0");
+}
+
+// Choosing a folder without static.ini, then one with it: the settings file holds the path alone.
+void ChooseFolderAndSave() {
+    Program program = Start(FreshStartFolder("choose"));
+    AnswerStartQuestion(program);
+    HWND chooser = ChooserWindow(program);
+    BrowseTo(program, chooser, Work("empty\\"));
+    Strings names = BrowserRowNames(program, chooser);
+    ExpectLines(names, {".."}, "an empty folder shows the parent entry alone");
+    ClickButton(Control(chooser, "Button"));
+    ConfirmMessage(program, "Wrong folder selected", "There is no 'static.ini'");
+    Expect(IsWindowVisible(chooser) != FALSE, "the chooser stays open after a wrong folder");
+    ExpectText(ChooserPath(chooser), Work("empty\\"), "the path box keeps its text");
+
+    OpenBrowserRow(program, chooser, "..", false);
+    Require(WaitForChooserPath(chooser, Work("")), "the parent entry leads back to " + Work(""));
+    std::string rest = "tree\\" + CatalogueTail;
+    for (std::size_t start = 0; start < rest.size();) {
+        std::size_t slash = rest.find('\\', start);
+        OpenBrowserRow(program, chooser, rest.substr(start, slash - start), false);
+        start = slash + 1;
+        Require(WaitForChooserPath(chooser, Work(rest.substr(0, start))),
+                "the browser opens " + rest.substr(0, start));
+    }
+    SelectBrowserRow(program, chooser, "static.ini");
+    Expect(WaitForChooserPath(chooser, TreeCatalogue() + "static.ini"),
+           "a selected file is shown after its folder");
+    ClickButton(Control(chooser, "Button"));
+    ConfirmMessage(program, "Path saved", "Path saved in verrant.ini");
+    Expect(WaitUntilGone(chooser), "the chooser closes once a folder is taken");
+    std::string saved;
+    Expect(ReadBytes(Work("start\\choose\\verrant.ini"), saved),
+           "verrant.ini is written in the start folder");
+    ExpectText(saved, TreeCatalogue(), "verrant.ini holds the folder alone, with no line end");
+
+    PressCloseBox(program.main);
+    Expect(Finish(program) == 0, "the close box ends the program with exit code 0");
+}
+
+// A settings file naming a folder that lost its static.ini.
+void SettingsFolderLost() {
+    std::string lost = Work("gone\\");
+    Program program = Start(FreshStartFolder("lost", &lost));
+    ConfirmMessage(program, "static,ini failure", "static.ini not found in " + lost);
+    Pause(300);
+    Expect(!FileExists(Work("start\\lost\\verrant.ini")), "the settings file is deleted");
+    Expect(FindProgramWindow(program, "Searching static.ini") == nullptr, "no chooser is shown at start");
+    Expect(!MessageBoxShown(program), "no further question at start");
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// "Clear path ..." twice, then a command that needs the folder asks for it.
+void ClearPathTwice() {
+    std::string tree = TreeCatalogue();
+    Program program = Start(FreshStartFolder("clear", &tree));
+    Pause(300);
+    Expect(!MessageBoxShown(program), "a valid settings file asks nothing at start");
+    ChooseMenuItem(program, 12);
+    ConfirmMessage(program, "Path cleared", "verrant.ini deleted");
+    Expect(!FileExists(Work("start\\clear\\verrant.ini")), "verrant.ini is deleted");
+    ChooseMenuItem(program, 12);
+    ConfirmMessage(program, "Path cleared failure", "Nothing to clear");
+    ChooseMenuItem(program, 3);
+    HWND chooser = ChooserWindow(program);
+    PressCloseBox(chooser);
+    Expect(WaitUntilGone(chooser), "the chooser closes");
+    Pause(300);
+    Expect(!MessageBoxShown(program), "a command without a folder ends silently");
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// ".. doubled objects" with the progress list on: its lines, the report on the desktop, Notepad.
+void DoubledObjectsWithProgressList() {
+    std::string report = DesktopFolder() + "Doubled_objects.txt";
+    DeleteFileA(report.c_str());
+    std::string tree = TreeCatalogue();
+    Program program = Start(FreshStartFolder("doubled", &tree));
+    HWND toggle = Control(program.main, "Button", 1);
+    ClickButton(toggle);
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the toggle opens \"List searching window\"");
+    Expect(SendMessageA(toggle, BM_GETCHECK, 0, 0) == BST_CHECKED, "the toggle stays down");
+    ExpectFrame(progress, 650, 320, 370, 470, "progress list window");
+    ExpectStyle(progress, false, false, "progress list window");
+    Expect((GetClassLongA(progress, GCL_STYLE) & CS_NOCLOSE) != 0,
+           "Alt+F4 cannot close the progress list window");
+    HWND list = ProgressList(progress);
+    ExpectPlace(list, 10, 20, 350, 430, "progress list");
+    LONG style = GetWindowLongA(list, GWL_STYLE);
+    Expect((style & LBS_NOINTEGRALHEIGHT) && !(style & LBS_SORT),
+           "the list keeps its height and never sorts");
+    Expect((GetWindowLongA(list, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) != 0, "the list is sunken");
+
+    ChooseMenuItem(program, 3);
+    HWND notepad = WaitForWindowTitled("Doubled_objects", 10000);
+    Expect(notepad != nullptr, "Notepad opens the report");
+    Strings names = TreeNames();
+    Strings expected;
+    for (int i = 0; i < static_cast<int>(names.size()); ++i) {
+        expected.push_back("Build (" + std::to_string(i) + ") buildings.House$" +
+                           names[static_cast<std::size_t>(i)]);
+        if (i == 5)
+            expected.insert(expected.end(),
+                            {Ruler, "Double object (5) => (17): buildings.House$Dup1", Ruler});
+        if (i == 20)
+            expected.insert(expected.end(),
+                            {Ruler, "Double object (20) => (33): buildings.House$Dup2", Ruler});
+    }
+    expected.insert(expected.end(), {"", "Total number of objects: 40"});
+    ExpectLines(ListLines(list), expected, "progress list lines");
+    Expect(SendMessageA(list, LB_GETTOPINDEX, 0, 0) == 0, "the list does not scroll to new lines");
+    // The scroll bar shows once the lines do not fit.
+    Expect((GetWindowLongA(list, GWL_STYLE) & WS_VSCROLL) != 0, "the list has a vertical scroll bar");
+    std::string bytes;
+    Expect(ReadBytes(report, bytes), "Doubled_objects.txt is on the desktop");
+    ExpectText(
+        bytes,
+        "Doubled objects in your static.ini:\r\n\r\nDouble object (5) => (17): buildings.House$Dup1\r\n"
+        "Double object (20) => (33): buildings.House$Dup2\r\n",
+        "Doubled_objects.txt");
+    SetForegroundWindow(progress);
+    Screenshot("progress-list");
+    EndProcessesWithWindow("Doubled_objects", program.process.dwProcessId);
+
+    ClickButton(toggle);
+    Expect(WaitUntilGone(progress), "the toggle closes the progress list window");
+    Expect(SendMessageA(toggle, BM_GETCHECK, 0, 0) == BST_UNCHECKED, "the toggle comes up at the next click");
+    ClickButton(toggle);
+    HWND again = WaitForWindow(program, "List searching window");
+    Require(again != nullptr, "switching on again opens the window");
+    Expect(ListLines(ProgressList(again)).empty(), "the new window's list is empty");
+    PressCloseBox(program.main);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// No findings: the message box, shown while the progress list is open, disables that window.
+void NoFindingsDisablesProgressList() {
+    std::string clean = CleanCatalogue();
+    std::string report = DesktopFolder() + "Doubled_objects.txt";
+    DeleteFileA(report.c_str());
+    Program program = Start(FreshStartFolder("clean", &clean));
+    ClickButton(Control(program.main, "Button", 1));
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the progress list opens");
+    ChooseMenuItem(program, 3);
+    MessageBoxSeen seen = WaitForMessageBox(program);
+    ExpectText(seen.title, "No doubled objects", "no-findings title");
+    ExpectText(seen.text, "No doubled objects found in your static.ini", "no-findings text");
+    Expect(!seen.hasIcon, "the box has no icon");
+    Expect(IsWindowEnabled(progress) == FALSE, "the progress list is disabled while the box is shown");
+    Expect(IsWindowEnabled(program.main) == FALSE, "the main window is disabled while the box is shown");
+    ExpectLines(ListLines(ProgressList(progress)),
+                {"Build (0) buildings.House$A", "Build (1) buildings.House$a", "Build (2) buildings.House$B",
+                 "", "Total number of objects: 3"},
+                "progress lines without findings");
+    DismissMessageBox(seen);
+    Pause(200);
+    Expect(IsWindowEnabled(progress) != FALSE, "the progress list is enabled again");
+    Expect(IsWindowEnabled(program.main) != FALSE, "the main window is enabled again");
+    Expect(!FileExists(report), "no report without findings");
+    PressCloseBox(program.main);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// The program file carries its version and its icon.
+void ProgramFileResources() {
+    DWORD ignored = 0;
+    DWORD size = GetFileVersionInfoSizeA(Settings.program.c_str(), &ignored);
+    Require(size > 0, "verrant.exe has a version resource");
+    std::string data(size, '\0');
+    Require(GetFileVersionInfoA(Settings.program.c_str(), 0, size, data.data()) != FALSE,
+            "the version resource reads");
+    char* product = nullptr;
+    UINT length = 0;
+    Expect(VerQueryValueA(data.data(), "\\StringFileInfo\\040904B0\\ProductName",
+                          reinterpret_cast<void**>(&product), &length) &&
+               std::string(product) == "Verrant",
+           "the product name is Verrant");
+    Expect(ExtractIconExA(Settings.program.c_str(), -1, nullptr, nullptr, 0) >= 1,
+           "verrant.exe carries an icon");
+}
+
+struct Scenario {
+    const char* name;
+    std::function<void()> run;
+};
+
+}  // namespace
+
+int main(int argc, char** argv) {
+    if (argc < 4) {
+        std::printf("usage: e2e_driver PROGRAM PROBE_DLL WORK_FOLDER [SHOTS_FOLDER]\n0 passed, 1 failed\n");
+        return 2;
+    }
+    Settings.program = argv[1];
+    Settings.probeLibrary = argv[2];
+    Settings.workRoot = argv[3];
+    if (Settings.workRoot.back() != '\\') Settings.workRoot += '\\';
+    if (argc > 4) Settings.shotsFolder = std::string(argv[4]) + "\\";
+    SetEnvironmentVariableA(PROBE_FILE_VARIABLE, (Settings.workRoot + "probe-answer.txt").c_str());
+    SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX);
+    MakeFolders(Settings.workRoot);
+    MakeFixtures();
+
+    const Scenario scenarios[] = {
+        {"program file: version resource and icon", ProgramFileResources},
+        {"first start: question, chooser, closing it; main window, buttons, menu table; Close",
+         FirstStartAndMainWindow},
+        {"chooser: wrong folder, then a folder with static.ini; settings file bytes; close box",
+         ChooseFolderAndSave},
+        {"settings file naming a folder without static.ini", SettingsFolderLost},
+        {"Clear path twice; a command without a folder", ClearPathTwice},
+        {"doubled objects: progress list lines, report on the desktop, Notepad; toggle off and on",
+         DoubledObjectsWithProgressList},
+        {"no findings: message box disables the progress list", NoFindingsDisablesProgressList},
+    };
+    int passed = 0, failed = 0;
+    for (const Scenario& scenario : scenarios) {
+        Failures.clear();
+        try {
+            scenario.run();
+        } catch (const ScenarioStop& stop) {
+            Failures.push_back("stopped: " + stop.why);
+        } catch (const std::exception& error) {
+            Failures.push_back(std::string("stopped: ") + error.what());
+        }
+        EndProcessesWithWindow("Notepad", 0);
+        EndProcessesWithWindow("Verrant V.1.3", 0);
+        if (Failures.empty()) {
+            ++passed;
+            std::printf("PASS: %s\n", scenario.name);
+        } else {
+            ++failed;
+            std::printf("FAIL: %s\n", scenario.name);
+            for (const std::string& failure : Failures) std::printf("    %s\n", failure.c_str());
+        }
+        std::fflush(stdout);
+    }
+    if (!StartTimes.empty()) {
+        std::sort(StartTimes.begin(), StartTimes.end());
+        std::printf(
+            "start-up to a visible main window: fastest %.0f ms, median %.0f ms, slowest %.0f ms (%zu "
+            "starts)\n",
+            StartTimes.front(), StartTimes[StartTimes.size() / 2], StartTimes.back(), StartTimes.size());
+    }
+    std::printf("%d passed, %d failed\n", passed, failed);
+    return failed == 0 ? 0 : 1;
+}
