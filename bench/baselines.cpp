@@ -2,6 +2,7 @@
 
 #include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
+#include "checks/mesh_references.h"
 
 #include <cstdio>
 #include <cstring>
@@ -173,24 +174,12 @@ bool BareKeys(const BaselineInput& input) {
 
 //--- the mesh reference run: an index sized to the physical lines, 42 exclusion passes
 
-struct MeshIndexEntry {
+struct PlainMeshEntry {
     std::string title, sectionName;
     int number = 0;
     std::string mesh, meshLive, meshDead;
     unsigned char meshFound = 0, meshLiveFound = 0, meshDeadFound = 0;
 };
-
-const char* const StandardTitles[] = {
-    "Title House", "Title HouseWinter", "Title Railroads", "Title Sea", "Title Furniture",
-    "Title GroundPlate", "Title WinterGroundPlate", "Title ConcretePlate", "Title BlankPlate", "Title PCPPlate",
-    "Title Pac_GrPlate", "Title Pac_SandPlate", "Title Vehicles", "Title Trains", "Title Houses of Piter",
-    "Title Winter Houses of Piter", "Title Petropavlovskaia", "Title Petropavlovskaia Winter",
-    "Title Kronstadt Summer", "Title Kronstadt Winter", "Title FinlandHouse", "Title FinlandHouseWinter",
-    "Title Racing", "Title DesertGroundPlate", "Title House Pacific", "Title DummyGuns", "Title Mountain",
-    "Title Houses of Kiev", "Title Houses of Kiev winter", "Title Houses of Norway", "Title Houses of Burma",
-    "Title Houses of 46", "Title Winter Houses of 46", "Title Castles of Slovakia", "Title Churches of Slovakia",
-    "Title Houses of Slovakia", "Title Industry of Slovakia", "Title Ruins of Slovakia", "Title Try Duby AF",
-    "Title Slovakia Obstacles", "Title Rumania", "Title Humans"};
 
 void SetMeshValue(const std::string& line, std::string& field) {
     std::size_t at = LowerCopy(line).find("3do");
@@ -200,14 +189,14 @@ void SetMeshValue(const std::string& line, std::string& field) {
         if (c == '/') c = '\\';
 }
 
-bool BuildMeshIndex(const BaselineInput& input, std::vector<MeshIndexEntry>& index, long long& last) {
+bool BuildMeshIndex(const BaselineInput& input, std::vector<PlainMeshEntry>& index, long long& last) {
     std::string path = input.catalogueFolder + "/static.ini", line;
     std::FILE* file = OpenRead(path);
     if (!file) return false;
     long long lines = 0;
     while (ReadPhysicalLine(file, line)) ++lines;
     std::fclose(file);
-    index.assign(static_cast<std::size_t>(lines + 2), MeshIndexEntry());
+    index.assign(static_cast<std::size_t>(lines + 2), PlainMeshEntry());
     last = -1;
     file = OpenRead(path);
     if (!file) return false;
@@ -220,7 +209,7 @@ bool BuildMeshIndex(const BaselineInput& input, std::vector<MeshIndexEntry>& ind
             ReadCatalogueLine(file, title);
         } else if (Begins(line, "[bui")) {
             ++last;
-            MeshIndexEntry& entry = index[static_cast<std::size_t>(last)];
+            PlainMeshEntry& entry = index[static_cast<std::size_t>(last)];
             entry.title = title;
             entry.sectionName = SectionNameByEnds(line);
             entry.number = static_cast<int>(last);
@@ -233,7 +222,7 @@ bool BuildMeshIndex(const BaselineInput& input, std::vector<MeshIndexEntry>& ind
         }
     }
     std::fclose(file);
-    for (const char* standard : StandardTitles)
+    for (const std::string& standard : StandardTitles)
         for (long long i = 0; i <= last; ++i)
             if (index[static_cast<std::size_t>(i)].title == standard) index[static_cast<std::size_t>(i)].title = "";
     return true;
@@ -247,7 +236,7 @@ void WriteMeshReportHeader(Report& report, const char* third) {
 }
 
 bool SharedLiveDeadMeshes(const BaselineInput& input) {
-    std::vector<MeshIndexEntry> index;
+    std::vector<PlainMeshEntry> index;
     long long last = -1;
     if (!BuildMeshIndex(input, index, last)) return false;
     Report report;
@@ -257,7 +246,7 @@ bool SharedLiveDeadMeshes(const BaselineInput& input) {
     for (const char* line : {" ", stars.c_str(), "Using the same MeshLive/MeshDead", stars.c_str(), " "}) report.Line(line);
     bool any = false;
     for (long long i = 0; i <= last; ++i) {
-        const MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+        const PlainMeshEntry& entry = index[static_cast<std::size_t>(i)];
         if (entry.title.empty() || entry.meshLive.empty() || entry.meshDead.empty() || entry.meshLive != entry.meshDead)
             continue;
         any = true;
@@ -289,7 +278,7 @@ bool MeshFileOpens(const std::string& modFolder, const std::string& value) {
 }
 
 bool OpenPerMeshPerFolder(const BaselineInput& input) {
-    std::vector<MeshIndexEntry> index;
+    std::vector<PlainMeshEntry> index;
     long long last = -1;
     if (!BuildMeshIndex(input, index, last)) return false;
     DIR* mods = opendir(input.modsRoot.c_str());
@@ -301,7 +290,7 @@ bool OpenPerMeshPerFolder(const BaselineInput& input) {
         while (dirent* inner = mod ? readdir(mod) : nullptr) {
             if (LowerCopy(inner->d_name) != "3do" || !IsFolder(modFolder + "/" + inner->d_name)) continue;
             for (long long i = 0; i <= last; ++i) {
-                MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+                PlainMeshEntry& entry = index[static_cast<std::size_t>(i)];
                 if (entry.title.empty()) continue;
                 const std::pair<std::string*, unsigned char*> fields[] = {{&entry.mesh, &entry.meshFound},
                                                                           {&entry.meshLive, &entry.meshLiveFound},
@@ -321,7 +310,7 @@ bool OpenPerMeshPerFolder(const BaselineInput& input) {
     WriteMeshReportHeader(report, "Wrong sim references in your static.ini:");
     bool any = false;
     for (long long i = 0; i <= last; ++i) {
-        const MeshIndexEntry& entry = index[static_cast<std::size_t>(i)];
+        const PlainMeshEntry& entry = index[static_cast<std::size_t>(i)];
         if (entry.title.empty()) continue;
         std::string object = "Object (" + std::to_string(entry.number) + ")";
         if (!entry.mesh.empty() && !entry.meshFound) {

@@ -4,9 +4,6 @@
 #include "checks/doubled_objects.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    bool written = false;
-    CommandResult result =
-        RunCheckAgainstBaseline(data, size, FindDoubledObjects, "Doubled_objects.txt", "pairwise", written);
-    Require(result == (written ? CommandResult::Findings : CommandResult::NothingFound), "the result");
+    RunCheckAgainstBaseline(data, size, FindDoubledObjects, "Doubled_objects.txt", "pairwise", true);
     return 0;
 }

@@ -13,11 +13,10 @@ CommandResult FindInScratchCatalogue() { return FindEmptyReferences(CatalogueFol
 }  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    bool written = false;
     CommandResult result =
-        RunCheckAgainstBaseline(data, size, FindInScratchCatalogue, "Empty_references.txt", "bare-keys", written);
-    bool exists = false;
-    std::string report = ReadDesktopFile("Empty_references.txt", exists);
+        RunCheckAgainstBaseline(data, size, FindInScratchCatalogue, "Empty_references.txt", "bare-keys", false);
+    bool written = false;
+    std::string report = ReadDesktopFile("Empty_references.txt", written);
     bool none = std::string_view(report).ends_with("\r\n\r\nNo empty references found in your static.ini") &&
                 report.find("Empty reference: ") == std::string::npos;
     Require(written, "the report is always written");

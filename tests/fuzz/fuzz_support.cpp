@@ -87,17 +87,20 @@ std::string BaselineOutput(const std::string& baseline, const std::string& repor
 }
 
 CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
-                                      const std::string& report, const std::string& baseline, bool& written) {
+                                      const std::string& report, const std::string& baseline,
+                                      bool reportOnlyWithFindings) {
     ResetForInput();
     WriteScratchFile("static.ini", std::string(reinterpret_cast<const char*>(data), size));
     CatalogueFolder = ScratchFolder();
     ProgressListOn = size > 0 && (data[0] & 1);
     if (ProgressListOn) OpenProgressList();
     CommandResult result = check();
+    bool written = false, expected = false;
     std::string text = ReadDesktopFile(report, written);
-    bool expected = false;
     std::string plain = BaselineOutput(baseline, report, expected);
     Require(written == expected && text == plain, "the report is the straightforward method's");
+    if (reportOnlyWithFindings)
+        Require(result == (written ? CommandResult::Findings : CommandResult::NothingFound), "the result");
     return result;
 }
 

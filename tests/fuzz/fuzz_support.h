@@ -24,10 +24,11 @@ std::string ReadDesktopFile(const std::string& name, bool& exists);
 // "@static.ini", the catalogue it rewrote, which must then be a copy in the folder "copy").
 std::string BaselineOutput(const std::string& baseline, const std::string& report, bool& exists);
 // Runs a catalogue check on the input as static.ini (the progress list on for an odd first byte)
-// and requires its report to be the baseline's, byte for byte, or both to write none. Gives the
-// check's result and whether a report was written.
+// and requires its report to be the baseline's, byte for byte, or both to write none. For a check
+// that writes its report only with findings, the result must say whether it did. Gives the result.
 CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
-                                      const std::string& report, const std::string& baseline, bool& written);
+                                      const std::string& report, const std::string& baseline,
+                                      bool reportOnlyWithFindings);
 // Stops the run with a message when a property fails; libFuzzer keeps the input.
 void Require(bool holds, const char* what);
 // The lines of a catalogue as the program's reader gives them, trimmed or not.

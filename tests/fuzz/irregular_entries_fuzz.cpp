@@ -4,9 +4,6 @@
 #include "checks/irregular_entries.h"
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    bool written = false;
-    CommandResult result =
-        RunCheckAgainstBaseline(data, size, CheckIrregularEntries, "Irregular_entrys.txt", "prefix-table", written);
-    Require(result == (written ? CommandResult::Findings : CommandResult::NothingFound), "the result");
+    RunCheckAgainstBaseline(data, size, CheckIrregularEntries, "Irregular_entrys.txt", "prefix-table", true);
     return 0;
 }

@@ -19,6 +19,7 @@
 // pool of meshes of which most, not all, lie in the mod's 3do folder.
 #include "tree_generator.h"
 
+#include "checks/mesh_references.h"
 #include "map_records.h"
 
 #include <algorithm>
@@ -48,19 +49,6 @@ struct Random {
     bool Chance(double p) { return Unit() < p; }
     template <typename T, std::size_t N> const T& Pick(const T (&items)[N]) { return items[Below(N)]; }
 };
-
-const char* const StandardTitles[] = {
-    "Title House", "Title HouseWinter", "Title Railroads", "Title Sea", "Title Furniture",
-    "Title GroundPlate", "Title WinterGroundPlate", "Title ConcretePlate", "Title BlankPlate", "Title PCPPlate",
-    "Title Pac_GrPlate", "Title Pac_SandPlate", "Title Vehicles", "Title Trains", "Title Houses of Piter",
-    "Title Winter Houses of Piter", "Title Petropavlovskaia", "Title Petropavlovskaia Winter",
-    "Title Kronstadt Summer", "Title Kronstadt Winter", "Title FinlandHouse", "Title FinlandHouseWinter",
-    "Title Racing", "Title DesertGroundPlate", "Title House Pacific", "Title DummyGuns", "Title Mountain",
-    "Title Houses of Kiev", "Title Houses of Kiev winter", "Title Houses of Norway", "Title Houses of Burma",
-    "Title Houses of 46", "Title Winter Houses of 46", "Title Castles of Slovakia", "Title Churches of Slovakia",
-    "Title Houses of Slovakia", "Title Industry of Slovakia", "Title Ruins of Slovakia", "Title Try Duby AF",
-    "Title Slovakia Obstacles", "Title Rumania", "Title Humans"};
-const int StandardTitleCount = sizeof(StandardTitles) / sizeof(StandardTitles[0]);
 
 const char* const Words[] = {"Barn",    "Shed",   "Kiosk",    "Pier",     "Hangar",  "Tower",   "Church",
                              "Bunker",  "Tent",   "Wall",     "Fence",    "Bridge",  "Crane",   "Tank",
@@ -318,8 +306,9 @@ Plan MakePlan(const TreeShape& shape) {
                      "// static.ini of a merged modpack", "//------------------------------------------------------------"};
     planner.plan.blocks.push_back(heading);
     for (int i = 0; i < preamble; ++i) planner.AddObject(nullptr);
-    for (int t = 0; t < StandardTitleCount; ++t) {
-        int count = standard / StandardTitleCount + (t < standard % StandardTitleCount ? 1 : 0);
+    const int titles = static_cast<int>(StandardTitles.size());
+    for (int t = 0; t < titles; ++t) {
+        int count = standard / titles + (t < standard % titles ? 1 : 0);
         planner.AddGroup(StandardTitles[t], CrLf, false);
         for (int i = 0; i < count; ++i) planner.AddObject(nullptr);
     }
@@ -327,7 +316,7 @@ Plan MakePlan(const TreeShape& shape) {
         if (mod.objectCount == 0) continue;
         // Some mods add to a standard group, some split their objects over two groups.
         bool intoStandard = planner.random.Chance(0.05);
-        planner.AddGroup(intoStandard ? StandardTitles[planner.random.Below(StandardTitleCount)] : mod.title,
+        planner.AddGroup(intoStandard ? StandardTitles[planner.random.Below(titles)] : mod.title,
                          mod.lineEnd, true);
         int split = planner.random.Chance(0.2) ? mod.objectCount / 2 : -1;
         for (int i = 0; i < mod.objectCount; ++i) {
