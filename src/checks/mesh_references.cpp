@@ -10,6 +10,8 @@
 #include "shell/reports.h"
 
 #include <algorithm>
+#include <string_view>
+#include <unordered_map>
 
 const MeshSlot MeshSlots[3] = {{&MeshIndexEntry::mesh, &MeshIndexEntry::meshFound},
                                {&MeshIndexEntry::meshLive, &MeshIndexEntry::meshLiveFound},
@@ -166,6 +168,9 @@ bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEnt
     // Only the first group's title line keeps its blanks; every later one is trimmed.
     if (grouped) NextPhysicalLine(reader, title);
     while (grouped && NextCatalogueLine(reader, line)) {
+        // Markers and headers begin with "[", mesh keys with "M": most lines of a big catalogue
+        // are passed over at their first byte.
+        if (line.empty() || (line[0] != '[' && line[0] != 'M')) continue;
         if (line == GroupMarker) {
             NextCatalogueLine(reader, title);
         } else if (IsBuildingHeader(line)) {
@@ -188,15 +193,21 @@ bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEnt
     return true;
 }
 
+// One pass sorts the entries of standard groups by their title, in index order; the titles are then
+// excluded one after the other as before, without a walk over the whole index for each of the 42.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
     if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "});
-    for (const std::string& title : StandardTitles) {
-        if (ProgressListOn) AddLines({StepRuler, "Excluding " + title, " "});
+    std::unordered_map<std::string_view, std::size_t> titlePlace;
+    for (std::size_t t = 0; t < StandardTitles.size(); ++t) titlePlace.emplace(StandardTitles[t], t);
+    std::vector<std::vector<MeshIndexEntry*>> byTitle(StandardTitles.size());
+    for (MeshIndexEntry& entry : index)
+        if (auto place = titlePlace.find(entry.title); place != titlePlace.end()) byTitle[place->second].push_back(&entry);
+    for (std::size_t t = 0; t < StandardTitles.size(); ++t) {
+        if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "});
         DrainPendingEvents();
-        for (MeshIndexEntry& entry : index) {
-            if (entry.title != title) continue;
-            if (ProgressListOn) AddProgressLine("Excluding " + entry.sectionName);
-            entry.title.clear();
+        for (MeshIndexEntry* entry : byTitle[t]) {
+            if (ProgressListOn) AddProgressLine("Excluding " + entry->sectionName);
+            entry->title.clear();
         }
     }
 }
