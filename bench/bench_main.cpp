@@ -284,7 +284,8 @@ int main(int argc, char** argv) {
     places.modsRoot = fs::absolute(options.tree + "/mods").string();
     places.catalogueFolder = places.modsRoot + "/std/com/maddox/il2/objects";
     places.mapFile = places.modsRoot + "/mapmods/maps/Map1/actors.static";
-    places.scratch = fs::absolute(options.tree + "/bench-scratch").string();
+    // Per run, so two benchmarks on one tree do not empty each other's folders.
+    places.scratch = fs::absolute(options.tree + "/bench-scratch-" + std::to_string(getpid())).string();
     places.commandReports = places.scratch + "/command";
     places.baselineReports = places.scratch + "/baseline";
     places.copyFolder = places.scratch + "/catalogue";
