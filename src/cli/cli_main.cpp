@@ -5,8 +5,10 @@
 #include "checks/doubled_objects.h"
 #include "checks/empty_references.h"
 #include "checks/irregular_entries.h"
+#include "checks/mesh_references.h"
 #include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
+#include "location/derived_paths.h"
 #include "platform/headless/headless.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
@@ -32,6 +34,12 @@ CommandResult InCatalogueFolder(CommandResult (*command)(const std::string&, con
     return command(CatalogueFolder, mode);
 }
 
+// The mesh reference run takes the mods root of the folder, as the menu gives it.
+CommandResult WithModsRoot(const std::string& mode) {
+    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
+    return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), mode);
+}
+
 const CliCommand Commands[] = {
     {"doubled-objects", "building headers whose section names occur more than once",
      [](const CliOptions&) { return FindDoubledObjects(); }},
@@ -50,6 +58,10 @@ const CliCommand Commands[] = {
     {"fmb-plus-list", "object list for FMB+, with plates (Static_list_FMBplus.txt)",
      [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb+"); }},
     {"missing-objects", "objects a map (--map FILE) places that the catalogue lacks", RunMissingObjectsCommand},
+    {"wrong-sim-references", "mesh files that no 3do folder of a mod holds",
+     [](const CliOptions&) { return WithModsRoot("missing"); }},
+    {"doubled-used-sims", "objects whose MeshLive and MeshDead are the same file",
+     [](const CliOptions&) { return WithModsRoot("doubled"); }},
 };
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;

@@ -1,0 +1,275 @@
+#include "checks/mesh_references.h"
+
+#include "catalogue/catalogue_reader.h"
+#include "catalogue/text.h"
+#include "checks/mesh_folder_search.h"
+#include "platform/platform.h"
+#include "shell/app_state.h"
+#include "shell/messages.h"
+#include "shell/progress_list.h"
+#include "shell/reports.h"
+
+#include <algorithm>
+
+const MeshSlot MeshSlots[3] = {{&MeshIndexEntry::mesh, &MeshIndexEntry::meshFound},
+                               {&MeshIndexEntry::meshLive, &MeshIndexEntry::meshLiveFound},
+                               {&MeshIndexEntry::meshDead, &MeshIndexEntry::meshDeadFound}};
+
+// Matched whole and case-sensitively; the small "winter" of the Kiev group is the game's own.
+const std::vector<std::string> StandardTitles = {
+    "Title House",
+    "Title HouseWinter",
+    "Title Railroads",
+    "Title Sea",
+    "Title Furniture",
+    "Title GroundPlate",
+    "Title WinterGroundPlate",
+    "Title ConcretePlate",
+    "Title BlankPlate",
+    "Title PCPPlate",
+    "Title Pac_GrPlate",
+    "Title Pac_SandPlate",
+    "Title Vehicles",
+    "Title Trains",
+    "Title Houses of Piter",
+    "Title Winter Houses of Piter",
+    "Title Petropavlovskaia",
+    "Title Petropavlovskaia Winter",
+    "Title Kronstadt Summer",
+    "Title Kronstadt Winter",
+    "Title FinlandHouse",
+    "Title FinlandHouseWinter",
+    "Title Racing",
+    "Title DesertGroundPlate",
+    "Title House Pacific",
+    "Title DummyGuns",
+    "Title Mountain",
+    "Title Houses of Kiev",
+    "Title Houses of Kiev winter",
+    "Title Houses of Norway",
+    "Title Houses of Burma",
+    "Title Houses of 46",
+    "Title Winter Houses of 46",
+    "Title Castles of Slovakia",
+    "Title Churches of Slovakia",
+    "Title Houses of Slovakia",
+    "Title Industry of Slovakia",
+    "Title Ruins of Slovakia",
+    "Title Try Duby AF",
+    "Title Slovakia Obstacles",
+    "Title Rumania",
+    "Title Humans",
+};
+
+namespace {
+
+const std::string GroupMarker = "[***]";
+const std::string StepRuler = "//**************************";
+const std::string EntryRuler(14, '*');
+const std::string SharedRuler(38, '*');
+
+bool IsSet(const std::string& mesh) { return !mesh.empty(); }
+bool IsMissing(const std::string& mesh, bool found) { return IsSet(mesh) && !found; }
+
+std::string ObjectLine(const MeshIndexEntry& entry) {
+    return "Object (" + std::to_string(entry.number) + ")";
+}
+
+std::string FoundLine(const std::string& key, const std::string& mesh, bool found) {
+    return (found ? "Found: " : "Not found: ") + key + " " + mesh;
+}
+
+bool SharesLiveDeadMesh(const MeshIndexEntry& entry) {
+    return !entry.title.empty() && IsSet(entry.meshLive) && entry.meshLive == entry.meshDead;
+}
+
+void AddLines(std::initializer_list<std::string> lines, const LineSink& add = AddProgressLine) {
+    for (const std::string& line : lines) add(line);
+}
+
+void AddBlockStart(const MeshIndexEntry& entry, const LineSink& add) {
+    add(EntryRuler);
+    add(ObjectLine(entry));
+    add(entry.sectionName);
+}
+
+// Every set mesh with its result.
+bool ListMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink& add) {
+    AddLines({" ", StepRuler, "Starting output", " "}, add);
+    DrainOnePendingEvent();
+    bool reported = false;
+    for (const MeshIndexEntry& entry : index) {
+        if (entry.title.empty()) continue;
+        if (IsSet(entry.mesh)) {
+            AddBlockStart(entry, add);
+            add(FoundLine("Mesh", entry.mesh, entry.meshFound));
+            reported = reported || !entry.meshFound;
+        }
+        if (!IsSet(entry.meshLive) && !IsSet(entry.meshDead)) continue;
+        AddBlockStart(entry, add);
+        if (IsSet(entry.meshLive)) {
+            add(FoundLine("MeshLive", entry.meshLive, entry.meshLiveFound));
+            reported = reported || !entry.meshLiveFound;
+        }
+        if (IsSet(entry.meshDead)) {
+            // The list has always written this one with a capital F.
+            add((entry.meshDeadFound ? "Found: MeshDead " : "Not Found: MeshDead ") + entry.meshDead);
+            reported = reported || !entry.meshDeadFound;
+        }
+    }
+    if (!reported) add("No missing Meshs found");
+    return reported;
+}
+
+// Only the missing meshes; when MeshLive and MeshDead are both missing, both are named.
+bool WriteMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink& add) {
+    bool reported = false;
+    for (const MeshIndexEntry& entry : index) {
+        if (entry.title.empty()) continue;
+        if (IsMissing(entry.mesh, entry.meshFound)) {
+            reported = true;
+            AddBlockStart(entry, add);
+            add(FoundLine("Mesh", entry.mesh, false));
+        }
+        bool liveMissing = IsMissing(entry.meshLive, entry.meshLiveFound);
+        bool deadMissing = IsMissing(entry.meshDead, entry.meshDeadFound);
+        if (!liveMissing && !deadMissing) continue;
+        reported = true;
+        AddBlockStart(entry, add);
+        if (liveMissing) add(FoundLine("MeshLive", entry.meshLive, false));
+        if (deadMissing) add(FoundLine("MeshDead", entry.meshDead, false));
+    }
+    if (!reported) add("No wrong references found");
+    return reported;
+}
+
+}  // namespace
+
+bool CutMeshValue(const std::string& line, std::string& value) {
+    std::size_t start = LowerCopy(line).find("3do");
+    if (start == std::string::npos) return false;
+    value = line.substr(start);
+    std::replace(value.begin(), value.end(), '/', '\\');
+    return true;
+}
+
+// The index grows as headers are read: a slot per physical line would hold most of a big catalogue
+// in empty entries.
+bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEntry>& index) {
+    index.clear();
+    CatalogueReader reader;
+    if (!OpenCatalogue(catalogueFolder, reader)) return false;
+    std::string line;
+    bool grouped = false;
+    while (!grouped && NextCatalogueLine(reader, line)) grouped = line == GroupMarker;
+    std::string title;
+    // Only the first group's title line keeps its blanks; every later one is trimmed.
+    if (grouped) NextPhysicalLine(reader, title);
+    while (grouped && NextCatalogueLine(reader, line)) {
+        if (line == GroupMarker) {
+            NextCatalogueLine(reader, title);
+        } else if (IsBuildingHeader(line)) {
+            MeshIndexEntry entry;
+            entry.title = title;
+            entry.sectionName = SectionNameByEnds(line);
+            entry.number = static_cast<int>(index.size());
+            index.push_back(std::move(entry));
+        } else if (index.empty()) {
+            continue;  // keys before the first header belong to no entry
+        } else if (StartsWith(line, "Mesh ")) {
+            CutMeshValue(line, index.back().mesh);
+        } else if (StartsWith(line, "MeshLive")) {
+            CutMeshValue(line, index.back().meshLive);
+        } else if (StartsWith(line, "MeshDead")) {
+            CutMeshValue(line, index.back().meshDead);
+        }
+    }
+    CloseCatalogue(reader);
+    return true;
+}
+
+void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
+    if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "});
+    for (const std::string& title : StandardTitles) {
+        if (ProgressListOn) AddLines({StepRuler, "Excluding " + title, " "});
+        DrainPendingEvents();
+        for (MeshIndexEntry& entry : index) {
+            if (entry.title != title) continue;
+            if (ProgressListOn) AddProgressLine("Excluding " + entry.sectionName);
+            entry.title.clear();
+        }
+    }
+}
+
+bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
+    return output == MeshOutput::ProgressList ? ListMissingMeshes(index, add)
+                                              : WriteMissingMeshes(index, add);
+}
+
+bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
+                                const LineSink& add) {
+    const bool list = output == MeshOutput::ProgressList;
+    AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, add);
+    bool reported = false;
+    for (const MeshIndexEntry& entry : index) {
+        if (!SharesLiveDeadMesh(entry)) continue;
+        reported = true;
+        add(EntryRuler);
+        // The list joins the object line and the section name; the report keeps them apart.
+        if (list) {
+            add(ObjectLine(entry) + entry.sectionName);
+        } else {
+            add(ObjectLine(entry));
+            add(entry.sectionName);
+        }
+        add("MeshLive: " + entry.meshLive);
+        add("MeshDead: " + entry.meshDead);
+    }
+    if (!reported) add("No doubled used Meshs found");
+    return reported;
+}
+
+CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode) {
+    const bool missingMode = mode == "missing";
+    Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
+    Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);
+    if (ProgressListOn) {
+        ClearProgressList();
+        AddLines({StepRuler, "Building object index"});
+    }
+    std::vector<MeshIndexEntry> index;
+    if (!BuildMeshIndex(CatalogueFolder, index)) {
+        CloseTopWindow(waitWindow);
+        ShowMessage("static.ini failure", "Can't open static.ini");
+        return CommandResult::Failed;
+    }
+    ExcludeStandardTitles(index);
+    if (ProgressListOn) {
+        DrainPendingEvents();
+        AddLines({" ", StepRuler, "Searching folders & files", " "});
+        DrainPendingEvents();
+    }
+    if (missingMode) {
+        SearchModMeshFolders(index, modsRoot, bar);
+        if (ProgressListOn) ReportMissingMeshes(index, MeshOutput::ProgressList, AddProgressLine);
+    } else if (ProgressListOn) {
+        ReportSharedLiveDeadMeshes(index, MeshOutput::ProgressList, AddProgressLine);
+    }
+    CloseTopWindow(waitWindow);
+
+    ReportFile report;
+    if (!CreateReport(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report))
+        return CommandResult::Failed;
+    WriteReportLine(
+        report,
+        "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked");
+    WriteReportLine(report, "Mod objects using sims/meshes of standard objects will cause wrong alert");
+    WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:"
+                                        : "Doubled used sims in your static.ini:");
+    WriteReportLine(report, "");
+    LineSink toReport = [&report](const std::string& line) { WriteReportLine(report, line); };
+    bool reported = missingMode ? ReportMissingMeshes(index, MeshOutput::ReportBody, toReport)
+                                : ReportSharedLiveDeadMeshes(index, MeshOutput::ReportBody, toReport);
+    if (!FinishReport(report)) return CommandResult::Failed;
+    return reported ? CommandResult::Findings : CommandResult::NothingFound;
+}

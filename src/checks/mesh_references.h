@@ -1,0 +1,54 @@
+// The mesh reference run behind ".. wrong sim references" (mode "missing": mesh files that no mod's
+// 3do folder holds) and ".. doubled used sims" (mode "doubled": entries whose MeshLive and MeshDead
+// are the same file). Both read the catalogue into one index of entries.
+#pragma once
+
+#include "shell/command_result.h"
+
+#include <functional>
+#include <string>
+#include <vector>
+
+struct MeshIndexEntry {
+    std::string title;        // the title line of the entry's group; "" once excluded
+    std::string sectionName;  // end cut of the building header
+    int number = 0;           // ordinal among the headers after the first group marker
+    std::string mesh;         // "Mesh " value from its first "3do", "/" turned into "\"; "" when unset
+    std::string meshLive;
+    std::string meshDead;
+    bool meshFound = false;
+    bool meshLiveFound = false;
+    bool meshDeadFound = false;
+};
+
+// A mesh field of an entry with its found flag, so the three can be walked in their order.
+struct MeshSlot {
+    std::string MeshIndexEntry::*value;
+    bool MeshIndexEntry::*found;
+};
+extern const MeshSlot MeshSlots[3];  // mesh, meshLive, meshDead
+
+// The game's own title groups, in the order in which they are excluded.
+extern const std::vector<std::string> StandardTitles;
+
+// The value of a Mesh, MeshLive or MeshDead line: from its first "3do" in any letter case to the end,
+// in the line's own case, with "/" turned into "\". False when the line holds no "3do".
+bool CutMeshValue(const std::string& line, std::string& value);
+
+// Reads static.ini in the folder into the index, one entry per building header after the first group
+// marker. False when the catalogue cannot be opened.
+bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEntry>& index);
+// Empties the title of every entry in a standard title group; later steps pass over such entries.
+void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index);
+
+// Where a mode's findings go: the progress list or the report's body. Each gives its lines to the
+// sink and returns the reported flag.
+enum class MeshOutput { ProgressList, ReportBody };
+using LineSink = std::function<void(const std::string&)>;
+bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add);
+bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
+                                const LineSink& add);
+
+// The whole run for mode "missing" or "doubled" (any other mode runs as "doubled"). Reads
+// CatalogueFolder, which must be known; modsRoot ends in "\". Always writes and opens its report.
+CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode);

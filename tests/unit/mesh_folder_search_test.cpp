@@ -1,0 +1,161 @@
+#include "checks/mesh_folder_search.h"
+
+#include "plain_mesh_search.h"
+#include "platform/headless/headless.h"
+#include "shell/app_state.h"
+#include "shell/progress_list.h"
+#include "test_support.h"
+
+#include <algorithm>
+#include <random>
+
+namespace {
+
+MeshIndexEntry Entry(const std::string& title, const std::string& mesh, const std::string& live = "",
+                     const std::string& dead = "") {
+    MeshIndexEntry entry;
+    entry.title = title;
+    entry.mesh = mesh;
+    entry.meshLive = live;
+    entry.meshDead = dead;
+    return entry;
+}
+
+std::string Flags(const std::vector<MeshIndexEntry>& index) {
+    std::string flags;
+    for (const MeshIndexEntry& entry : index)
+        flags += std::string(entry.meshFound ? "1" : "0") + (entry.meshLiveFound ? "1" : "0") +
+                 (entry.meshDeadFound ? "1" : "0") + " ";
+    return flags;
+}
+
+// The positions the bar takes after so many visits: the first move after 5000, then every 4999.
+std::vector<int> BarMovesAfter(long long visits) {
+    std::vector<int> positions;
+    for (long long at = 5000; at <= visits; at += 4999)
+        positions.push_back(static_cast<int>(positions.size()) % 35 + 1);
+    return positions;
+}
+
+}  // namespace
+
+TEST(MeshFolderSearch, ShownModsRootStartsAtItsFirstMods) {
+    EXPECT_EQ(ShownModsRoot("C:\\Game\\mods\\"), "...\\mods\\");
+    EXPECT_EQ(ShownModsRoot("D:\\Sim\\Mods\\"), "...\\Mods\\");
+    EXPECT_EQ(ShownModsRoot("D:\\MODS_old\\Sim\\mods\\"), "...\\MODS_old\\Sim\\mods\\");
+    EXPECT_EQ(ShownModsRoot("ods\\"), "...\\ods\\");
+}
+
+TEST(MeshFolderSearch, BarMovesAtItsVisitCounts) {
+    HeadlessReset();
+    Handle window = OpenTopWindow("Wait", 0, 0, 10, 10, FrameStyle{});
+    Handle bar = AddProgressBar(window, 0, 0, 10, 10, 0, 35);
+    VisitCounter counter;
+    struct Step {
+        std::size_t visits;
+        long long total;
+    };
+    long long total = 0;
+    for (Step step : {Step{4999, 4999}, Step{1, 5000}, Step{4998, 9998}, Step{1, 9999}, Step{0, 9999},
+                      Step{35 * 4999, 9999 + 35 * 4999}, Step{123457, 9999 + 35 * 4999 + 123457}}) {
+        CountVisits(counter, step.visits, bar);
+        total += static_cast<long long>(step.visits);
+        ASSERT_EQ(total, step.total);
+        EXPECT_EQ(HeadlessControlOf(bar)->positionsSet, BarMovesAfter(total)) << total;
+    }
+}
+
+class MeshFolderSearchTest : public ScratchTest {
+protected:
+    std::string ModsRoot() const { return Folder("Game/mods"); }
+    void Mesh(const std::string& relative) const { Write("Game/" + relative, "sim"); }
+    Handle NewBar() const {
+        return AddProgressBar(OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{}), 10, 10, 160, 20, 0, 35);
+    }
+};
+
+TEST_F(MeshFolderSearchTest, BarCountsEveryEntryOncePerSearchedFolder) {
+    std::vector<MeshIndexEntry> index(2600, Entry("", "3do\\x.sim"));
+    index[7] = Entry("Title Mods", "3do\\mod7\\x.sim");
+    for (int mod = 0; mod < 70; ++mod) Write("Game/mods/Mod" + std::to_string(mod) + "/3do/readme", "");
+    Mesh("mods/Mod7/3do/mod7/x.sim");
+    Write("Game/mods/NoMeshes/3do_old/x.sim", "");
+    Handle bar = NewBar();
+    SearchModMeshFolders(index, ModsRoot(), bar);
+    EXPECT_EQ(HeadlessControlOf(bar)->positionsSet, BarMovesAfter(2600LL * 70));
+    EXPECT_EQ(Flags({index[7]}), "100 ");
+}
+
+TEST_F(MeshFolderSearchTest, FolderIsNoMeshFile) {
+    std::vector<MeshIndexEntry> index = {Entry("T", "3do", "3do\\Buildings\\", "3do\\Buildings\\a.sim"),
+                                         Entry("T", "3do\\Buildings\\a.sim\\", "3do\\Buildings\\.\\a.sim"),
+                                         Entry("T", "3do\\Buildings\\..\\Buildings\\a.sim")};
+    Mesh("mods/ModA/3do/Buildings/a.sim");
+    SearchModMeshFolders(index, ModsRoot(), NewBar());
+    EXPECT_EQ(Flags(index), "001 010 100 ");
+}
+
+TEST_F(MeshFolderSearchTest, UnlistableModsRootFindsNothing) {
+    std::vector<MeshIndexEntry> index = {Entry("T", "3do\\a.sim")};
+    ProgressListOn = true;
+    OpenProgressList();
+    SearchModMeshFolders(index, Folder("Game/none"), NewBar());
+    EXPECT_EQ(Flags(index), "000 ");
+    EXPECT_EQ(ProgressLines(), Strings{});
+}
+
+// Random trees with folders in other letter cases, decoys and odd path names: the search must give
+// the plain search's flags, lines and bar moves, with fewer opens.
+TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {
+    const Strings names = {"a.sim", "B.sim", "live.sim", "dead.SIM", "x"};
+    const Strings folders = {"Buildings", "buildings", "Sea", "Pier", "m.sim"};
+    const Strings meshFolders = {"3do", "3DO", "3Do", "3do_old", "3d0"};
+    for (unsigned seed = 1; seed <= 6; ++seed) {
+        std::mt19937 random(seed);
+        auto pick = [&random](const Strings& from) { return from[random() % from.size()]; };
+        std::string game = "Game" + std::to_string(seed);
+        std::string mods = game + "/mods";
+        auto randomPath = [&] {
+            std::string path;
+            for (unsigned depth = random() % 2; depth > 0; --depth) path += pick(folders) + "/";
+            return path + pick(names);
+        };
+        for (int mod = 0; mod < 6; ++mod) {
+            std::string modFolder = mod == 0 ? mods : mods + "/Mod" + std::to_string(mod);
+            for (int file = 0; file < 6; ++file)
+                Write(modFolder + "/" + pick(meshFolders) + "/" + randomPath(), "x");
+        }
+        Write(game + "/3do/" + randomPath(), "x");
+        std::vector<MeshIndexEntry> index;
+        const Strings odd = {"",      "",    "3do\\.\\a.sim", "3do\\..\\3do\\a.sim", "3do\\a.sim.",
+                             "3DO\\", "3do", "3do\\m.sim",    "3do_old\\a.sim",      "3do\\Sea\\\\a.sim"};
+        auto value = [&] {
+            if (random() % 4 == 0) return pick(odd);
+            std::string path = pick(meshFolders) + "/" + randomPath();
+            std::replace(path.begin(), path.end(), '/', '\\');
+            return path;
+        };
+        for (int entry = 0; entry < 60; ++entry)
+            index.push_back(Entry(random() % 5 == 0 ? "" : "Title Mods", value(), value(), value()));
+        std::vector<MeshIndexEntry> plainIndex = index;
+
+        HeadlessReset();
+        ProgressListOn = true;
+        OpenProgressList();
+        Handle bar = NewBar();
+        SearchModMeshFoldersPlainly(plainIndex, Folder(mods), bar);
+        HeadlessFileCounters plain = HeadlessCounters();
+        Strings plainLines = ProgressLines();
+        std::vector<int> plainMoves = HeadlessControlOf(bar)->positionsSet;
+
+        HeadlessReset();
+        OpenProgressList();
+        bar = NewBar();
+        SearchModMeshFolders(index, Folder(mods), bar);
+        EXPECT_EQ(Flags(index), Flags(plainIndex)) << "seed " << seed;
+        EXPECT_EQ(ProgressLines(), plainLines) << "seed " << seed;
+        EXPECT_EQ(HeadlessControlOf(bar)->positionsSet, plainMoves) << "seed " << seed;
+        EXPECT_LT(HeadlessCounters().opens, plain.opens) << "seed " << seed;
+        EXPECT_NE(Flags(index).find('1'), std::string::npos) << "seed " << seed;
+    }
+}
