@@ -3,12 +3,14 @@
 #include "checks/doubled_objects.h"
 #include "checks/empty_references.h"
 #include "checks/irregular_entries.h"
+#include "checks/mesh_references.h"
 #include "location/catalogue_folder.h"
+#include "location/derived_paths.h"
 #include "location/settings.h"
 #include "maps/missing_objects_window.h"
+#include "platform/platform.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
-#include "platform/platform.h"
 #include "shell/app_state.h"
 #include "shell/main_window.h"
 #include "shell/progress_list.h"
@@ -48,9 +50,11 @@ void RunMenuCommand(int id) {
         case MenuListForFmbPlus:
             if (EnsureCatalogueFolderKnown()) CreateMissionBuilderList(CatalogueFolder, "fmb+");
             break;
-        // Commands whose procedures come with their own units: one line each above when they land.
         case MenuWrongSimReferences:
+            if (EnsureCatalogueFolderKnown()) CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "missing");
+            break;
         case MenuDoubledUsedSims:
+            if (EnsureCatalogueFolderKnown()) CheckMeshReferences(DeriveModsRoot(CatalogueFolder), "doubled");
             break;
         case MenuCredit:
             break;

@@ -186,6 +186,34 @@ TEST_F(EventLoopTest, CommandsThatNeedTheFolderAskForIt) {
              EXPECT_EQ(Read("start/verrant.ini"), catalogue);
              EXPECT_EQ(Messages(), Strings({"Path saved: Path saved in verrant.ini"}));
          }},
+        {".. irregular entrys", MenuStep(Main, MenuIrregularEntries),
+         [&] {
+             EXPECT_EQ(Messages(),
+                       Strings({"No irregular objects: No irregular objects found in your static.ini"}));
+         }},
+        {".. empty references", MenuStep(Main, MenuEmptyReferences),
+         [&] { EXPECT_FALSE(Desktop("Empty_references.txt").empty()); }},
+        {".. wrong sim references", MenuStep(Main, MenuWrongSimReferences),
+         [&] { EXPECT_NE(Desktop("Missing_3do.txt").find("Wrong sim references"), std::string::npos); }},
+        {".. doubled used sims", MenuStep(Main, MenuDoubledUsedSims),
+         [&] {
+             EXPECT_NE(Desktop("Doubled_sims_or_meshes.txt").find("Doubled used sims"), std::string::npos);
+         }},
+        {".. objects list for FMB", MenuStep(Main, MenuListForFmb),
+         [&] { EXPECT_EQ(Desktop("Static_list_FMB.txt").rfind("Object list for fmb\r\n", 0), 0u); }},
+        {".. objects list for FMB+", MenuStep(Main, MenuListForFmbPlus),
+         [&] { EXPECT_EQ(Desktop("Static_list_FMBplus.txt").rfind("Object list for fmb+\r\n", 0), 0u); }},
+        {"Renumber static.ini", MenuStep(Main, MenuRenumber),
+         [&] {
+             EXPECT_EQ(Messages(), Strings({"Renumber static.ini: Done"}));
+             EXPECT_EQ(Read("Sim/mods/STD/com/maddox/il2/objects/static.ini"),
+                       "(0)\r\n[buildings.House$A]\r\n(1)\r\n[buildings.House$A]\r\n");
+         }},
+        {"Denumber static.ini", MenuStep(Main, MenuDenumber),
+         [&] {
+             EXPECT_EQ(Messages(), Strings({"Denumber static.ini: Done"}));
+             EXPECT_EQ(Read("Sim/mods/STD/com/maddox/il2/objects/static.ini"), TwoAs);
+         }},
         {"Open static.ini", ControlStep(Main, OpenCatalogueButtonId),
          [&] {
              ASSERT_EQ(HeadlessProcesses().size(), 1u);
@@ -226,4 +254,14 @@ TEST_F(EventLoopTest, CreditItemAndUnusedIdsDoNothing) {
     EXPECT_TRUE(HeadlessProcesses().empty());
     EXPECT_TRUE(Exists("start/verrant.ini"));
     EXPECT_EQ(HeadlessWaitsRunDry(), 1);
+}
+
+TEST_F(EventLoopTest, MissingObjectsWindowOpensWithoutAFolder) {
+    HeadlessScript(MenuStep(Main, MenuMissingObjects));
+    HeadlessScript(CloseStep("Searching missing objects"));
+    HeadlessScript(CloseStep(Main));
+    RunMainEventLoop();
+    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main, "Searching missing objects"}));
+    EXPECT_EQ(CatalogueFolder, "");
+    EXPECT_EQ(HeadlessWaitsRunDry(), 0);
 }
