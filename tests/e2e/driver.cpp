@@ -9,6 +9,8 @@
 #include <cstdio>
 #include <functional>
 
+#include <commctrl.h>
+
 namespace {
 
 const std::string CatalogueTail = "mods\\std\\com\\maddox\\il2\\objects\\";
@@ -641,6 +643,112 @@ void OpenCatalogueButton() {
     Expect(Finish(program) == 0, "exit code 0");
 }
 
+// Both mesh reference commands on the demo tree, against verrant-cli on the same tree.
+void MeshReferencesOnDemoTree() {
+    std::string catalogue = DemoCopy("demo-mesh") + CatalogueTail;
+    Program program = Start(FreshStartFolder("mesh", &catalogue));
+    ClickButton(Control(program.main, "Button", 1));
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the progress list opens");
+    struct MeshCommand {
+        int id;
+        const char* cliCommand;
+        std::string fileName;
+    };
+    MakeFolders(Work("cli-mesh"));
+    for (const MeshCommand& command : {MeshCommand{5, "wrong-sim-references", "Missing_3do.txt"},
+                                       MeshCommand{14, "doubled-used-sims", "Doubled_sims_or_meshes.txt"}}) {
+        std::string report = DesktopFolder() + command.fileName;
+        DeleteFileA(report.c_str());
+        CliRun run = RunCli(std::string(command.cliCommand) + " --progress --catalogue " + catalogue +
+                            " --report-dir " + Work("cli-mesh"));
+        Require(run.code == 1 && !run.lines.empty(),
+                std::string("verrant-cli ") + command.cliCommand + " reports findings on the demo tree");
+        std::string expected = FileBytes(Work("cli-mesh\\" + command.fileName));
+        ChooseMenuItem(program, command.id);
+        ExpectNotepadShows(command.fileName, expected, program);
+        std::string written;
+        Expect(ReadBytes(report, written), command.fileName + " is on the desktop");
+        Expect(written == expected, command.fileName + " holds what verrant-cli writes");
+        ExpectLines(ListLines(ProgressList(progress)), run.lines,
+                    std::string("progress lines of ") + command.cliCommand);
+        Expect(FindProgramWindow(program, "Wait") == nullptr, "the Wait window is closed after the run");
+    }
+    Expect(!MessageBoxShown(program), "the mesh checks show no message box");
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// Many mods and many entries keep the mesh search, and with it the Wait window, busy for a while.
+const int BigTreeEntries = 20000, BigTreeMods = 300;
+
+std::string MakeBigMeshTree() {
+    std::string root = Work("mesh-big\\"), catalogue = root + CatalogueTail;
+    MakeFolders(catalogue);
+    std::string text = "[***]\r\nTitle Generated\r\n";
+    for (int i = 0; i < BigTreeEntries; ++i)
+        text += "[buildings.House$Gen" + std::to_string(i) + "]\r\nMesh 3do/Gen/F" + std::to_string(i % 100) +
+                "/m" + std::to_string(i) + ".sim\r\n";
+    WriteBytes(catalogue + "static.ini", text);
+    for (int m = 0; m < BigTreeMods; ++m)
+        MakeFolders(root + "mods\\Mod" + std::to_string(m) + "\\3do\\Gen\\F" + std::to_string(m % 100));
+    return catalogue;
+}
+
+// The Wait window of ".. wrong sim references": caption only, its place and size, a moving bar.
+void WaitWindowDuringLongRun() {
+    std::string catalogue = MakeBigMeshTree();
+    std::string report = DesktopFolder() + "Missing_3do.txt";
+    DeleteFileA(report.c_str());
+    Program program = Start(FreshStartFolder("mesh-big", &catalogue));
+    ChooseMenuItem(program, 5);
+    HWND wait = nullptr;
+    LARGE_INTEGER frequency, began, seenAt, gone;
+    QueryPerformanceFrequency(&frequency);
+    QueryPerformanceCounter(&began);
+    for (int waited = 0; wait == nullptr && waited < 10000; waited += 5) {
+        wait = FindProgramWindow(program, "Wait");
+        if (wait == nullptr) Pause(5);
+    }
+    Require(wait != nullptr, "the Wait window appears during the run");
+    QueryPerformanceCounter(&seenAt);
+    ExpectFrame(wait, 400, 340, 180, 40, "Wait window");
+    LONG style = GetWindowLongA(wait, GWL_STYLE);
+    Expect((style & WS_CAPTION) == WS_CAPTION, "the Wait window has a title bar");
+    Expect((style & (WS_SYSMENU | WS_THICKFRAME | WS_MINIMIZEBOX | WS_MAXIMIZEBOX)) == 0,
+           "the Wait window has no system menu, close box or sizing border");
+    HWND bar = Control(wait, "msctls_progress32");
+    Require(bar != nullptr, "the Wait window holds a progress bar");
+    ExpectPlace(bar, 10, 10, 160, 20, "progress bar");
+    Screenshot("wait-window");
+    DWORD_PTR low = 99, high = 0, position = 0, highest = 0;
+    SendMessageTimeoutW(bar, PBM_GETRANGE, TRUE, 0, SMTO_NORMAL, 5000, &low);
+    SendMessageTimeoutW(bar, PBM_GETRANGE, FALSE, 0, SMTO_NORMAL, 5000, &high);
+    Expect(low == 0 && high == 35,
+           "the bar runs from 0 to 35: " + std::to_string(low) + ".." + std::to_string(high));
+    while (IsWindow(wait) && IsWindowVisible(wait)) {
+        if (SendMessageTimeoutW(bar, PBM_GETPOS, 0, 0, SMTO_NORMAL, 1000, &position))
+            highest = std::max(highest, position);
+        Pause(20);
+    }
+    QueryPerformanceCounter(&gone);
+    Expect(highest > 0 && highest <= 35,
+           "the bar moves within its range: highest " + std::to_string(highest));
+    std::printf("    the Wait window was seen %.0f ms after the command and stayed %.0f ms\n",
+                1000.0 * static_cast<double>(seenAt.QuadPart - began.QuadPart) / frequency.QuadPart,
+                1000.0 * static_cast<double>(gone.QuadPart - seenAt.QuadPart) / frequency.QuadPart);
+    HWND notepad = WaitForWindowTitled("Missing_3do.txt - ", 20000);
+    Expect(notepad != nullptr, "Notepad opens Missing_3do.txt");
+    std::string written;
+    Expect(ReadBytes(report, written) &&
+               written.find("Wrong sim references in your static.ini:\r\n\r\n") != std::string::npos &&
+               written.find("Gen" + std::to_string(BigTreeEntries - 1)) != std::string::npos,
+           "Missing_3do.txt lists the generated entries");
+    EndProcessesWithWindow("Missing_3do.txt - ", program.process.dwProcessId);
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
 // The program file carries its version and its icon.
 void ProgramFileResources() {
     DWORD ignored = 0;
@@ -699,6 +807,8 @@ int main(int argc, char** argv) {
          MissingObjectsWindow},
         {"renumber and denumber the demo catalogue; both mission-builder lists", RewriteAndLists},
         {"\"Open static.ini\" starts Notepad on the catalogue", OpenCatalogueButton},
+        {"wrong sim references and doubled used sims on the demo tree", MeshReferencesOnDemoTree},
+        {"the Wait window during a long mesh search", WaitWindowDuringLongRun},
     };
     int passed = 0, failed = 0;
     for (const Scenario& scenario : scenarios) {
