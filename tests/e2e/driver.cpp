@@ -473,6 +473,35 @@ void ExpectNotepadShows(const std::string& fileName, const std::string& bytes, c
     EndProcessesWithWindow(fileName + " - ", program.process.dwProcessId);
 }
 
+// A menu command whose report must be what verrant-cli writes for the same arguments: on the desktop
+// and in Notepad; with the progress list given, its lines are what verrant-cli prints.
+struct ReportCommand {
+    int id;
+    std::string cliArguments;
+    std::string fileName;
+    long cliExit;
+};
+
+void ExpectReportAsCli(Program& program, const ReportCommand& command, HWND progress) {
+    std::string report = DesktopFolder() + command.fileName, folder = Work("cli-reports\\");
+    MakeFolders(folder);
+    DeleteFileA(report.c_str());
+    DeleteFileA((folder + command.fileName).c_str());
+    CliRun run = RunCli(command.cliArguments + (progress ? " --progress" : "") + " --report-dir " + folder);
+    Require(run.code == command.cliExit && (progress == nullptr || !run.lines.empty()),
+            "verrant-cli " + command.cliArguments + " writes " + command.fileName + " (exit " +
+                std::to_string(run.code) + ")");
+    std::string expected = FileBytes(folder + command.fileName);
+    ChooseMenuItem(program, command.id);
+    ExpectNotepadShows(command.fileName, expected, program);
+    std::string written;
+    Expect(ReadBytes(report, written), command.fileName + " is on the desktop");
+    Expect(written == expected, command.fileName + " holds what verrant-cli writes");
+    if (progress != nullptr)
+        ExpectLines(ListLines(ProgressList(progress)), run.lines,
+                    "progress lines of " + command.cliArguments);
+}
+
 // "(", digits, ")", with nothing around them but blanks and tabs.
 bool IsNumberLine(const std::string& line) {
     std::size_t first = line.find_first_not_of(" \t"), last = line.find_last_not_of(" \t\r");
@@ -600,26 +629,9 @@ void RewriteAndLists() {
     Expect(!FileExists(catalogue + "static.ini.tmp"), "no static.ini.tmp is left");
     ExpectLines(ListLines(ProgressList(progress)), denumbered.lines, "progress lines of denumbering");
 
-    struct ListCommand {
-        int id;
-        const char* cliCommand;
-        std::string fileName;
-    };
-    MakeFolders(Work("cli-lists"));
-    for (const ListCommand& list : {ListCommand{8, "fmb-list", "Static_list_FMB.txt"},
-                                    ListCommand{9, "fmb-plus-list", "Static_list_FMBplus.txt"}}) {
-        std::string report = DesktopFolder() + list.fileName;
-        DeleteFileA(report.c_str());
-        CliRun run = RunCli(std::string(list.cliCommand) + " --catalogue " + reference + " --report-dir " +
-                            Work("cli-lists"));
-        Require(run.code == 0, std::string("verrant-cli ") + list.cliCommand + " writes its list");
-        std::string expected = FileBytes(Work("cli-lists\\" + list.fileName));
-        ChooseMenuItem(program, list.id);
-        ExpectNotepadShows(list.fileName, expected, program);
-        std::string written;
-        Expect(ReadBytes(report, written), list.fileName + " is on the desktop");
-        Expect(written == expected, list.fileName + " holds what verrant-cli writes");
-    }
+    ExpectReportAsCli(program, {8, "fmb-list --catalogue " + reference, "Static_list_FMB.txt", 0}, nullptr);
+    ExpectReportAsCli(program, {9, "fmb-plus-list --catalogue " + reference, "Static_list_FMBplus.txt", 0},
+                      nullptr);
     Expect(!MessageBoxShown(program), "the lists show no message box");
     ChooseMenuItem(program, 1);
     Expect(Finish(program) == 0, "exit code 0");
@@ -650,30 +662,12 @@ void MeshReferencesOnDemoTree() {
     ClickButton(Control(program.main, "Button", 1));
     HWND progress = WaitForWindow(program, "List searching window");
     Require(progress != nullptr, "the progress list opens");
-    struct MeshCommand {
-        int id;
-        const char* cliCommand;
-        std::string fileName;
-    };
-    MakeFolders(Work("cli-mesh"));
-    for (const MeshCommand& command : {MeshCommand{5, "wrong-sim-references", "Missing_3do.txt"},
-                                       MeshCommand{14, "doubled-used-sims", "Doubled_sims_or_meshes.txt"}}) {
-        std::string report = DesktopFolder() + command.fileName;
-        DeleteFileA(report.c_str());
-        CliRun run = RunCli(std::string(command.cliCommand) + " --progress --catalogue " + catalogue +
-                            " --report-dir " + Work("cli-mesh"));
-        Require(run.code == 1 && !run.lines.empty(),
-                std::string("verrant-cli ") + command.cliCommand + " reports findings on the demo tree");
-        std::string expected = FileBytes(Work("cli-mesh\\" + command.fileName));
-        ChooseMenuItem(program, command.id);
-        ExpectNotepadShows(command.fileName, expected, program);
-        std::string written;
-        Expect(ReadBytes(report, written), command.fileName + " is on the desktop");
-        Expect(written == expected, command.fileName + " holds what verrant-cli writes");
-        ExpectLines(ListLines(ProgressList(progress)), run.lines,
-                    std::string("progress lines of ") + command.cliCommand);
-        Expect(FindProgramWindow(program, "Wait") == nullptr, "the Wait window is closed after the run");
-    }
+    ExpectReportAsCli(program, {5, "wrong-sim-references --catalogue " + catalogue, "Missing_3do.txt", 1},
+                      progress);
+    Expect(FindProgramWindow(program, "Wait") == nullptr, "the Wait window is closed once the report opens");
+    ExpectReportAsCli(program,
+                      {14, "doubled-used-sims --catalogue " + catalogue, "Doubled_sims_or_meshes.txt", 1},
+                      progress);
     Expect(!MessageBoxShown(program), "the mesh checks show no message box");
     ChooseMenuItem(program, 1);
     Expect(Finish(program) == 0, "exit code 0");
