@@ -1,16 +1,24 @@
 // The end-to-end driver: starts verrant.exe under Wine in fresh start folders and works it through
 // its windows as a user would. Prints one line per scenario and ends with "N passed, M failed".
 //   e2e_driver.exe PROGRAM PROBE_DLL WORK_FOLDER [SHOTS_FOLDER]
+// The environment values VERRANT_E2E_DEMO_TREE and VERRANT_E2E_CLI name the demo tree and
+// verrant-cli.exe, which the scenarios of the map check, the rewriting and the lists need.
 #include "driver_support.h"
 
 #include <algorithm>
 #include <cstdio>
 #include <functional>
 
+#include <commctrl.h>
+
 namespace {
 
 const std::string CatalogueTail = "mods\\std\\com\\maddox\\il2\\objects\\";
 const std::string Ruler(67, '*');
+
+// Set by the test script: the demo tree to copy, and verrant-cli.exe as the reference.
+#define DEMO_TREE_VARIABLE "VERRANT_E2E_DEMO_TREE"
+#define CLI_VARIABLE "VERRANT_E2E_CLI"
 
 std::string Work(const std::string& relative) { return Settings.workRoot + relative; }
 std::string TreeCatalogue() { return Work("tree\\" + CatalogueTail); }
@@ -115,10 +123,11 @@ HWND ChooserWindow(const Program& program) {
     return chooser;
 }
 
-std::string ChooserPath(HWND chooser) { return WindowText(Control(chooser, "Edit")); }
+// The chooser's path box, or the status line of the missing objects window.
+std::string PathBoxText(HWND window) { return WindowText(Control(window, "Edit")); }
 
-bool WaitForChooserPath(HWND chooser, const std::string& path) {
-    for (int waited = 0; ChooserPath(chooser) != path; waited += 20) {
+bool WaitForPathBox(HWND window, const std::string& text) {
+    for (int waited = 0; PathBoxText(window) != text; waited += 20) {
         if (waited > 5000) return false;
         Pause(20);
     }
@@ -137,9 +146,8 @@ void BrowseTo(Program& program, HWND chooser, const std::string& folder) {
         std::string row = first ? name + "\\" : name;
         reached += name + "\\";
         OpenBrowserRow(program, chooser, row, first);
-        Require(WaitForChooserPath(chooser, reached), "the path box shows " + reached + " after opening " +
-                                                          row + " (it shows \"" + ChooserPath(chooser) +
-                                                          "\")");
+        Require(WaitForPathBox(chooser, reached), "the path box shows " + reached + " after opening " + row +
+                                                      " (it shows \"" + PathBoxText(chooser) + "\")");
         start = slash + 1;
         first = false;
     }
@@ -187,7 +195,7 @@ void FirstStartAndMainWindow() {
     ExpectCaptionsFit(program, chooser, "chooser");
     Screenshot("chooser-top-level");
     OpenBrowserRow(program, chooser, "C:\\", false);
-    WaitForChooserPath(chooser, "C:\\");
+    WaitForPathBox(chooser, "C:\\");
     Screenshot("chooser");
     PressCloseBox(chooser);
     Expect(WaitUntilGone(chooser), "the close box closes the chooser");
@@ -264,20 +272,20 @@ void ChooseFolderAndSave() {
     ClickButton(Control(chooser, "Button"));
     ConfirmMessage(program, "Wrong folder selected", "There is no 'static.ini'");
     Expect(IsWindowVisible(chooser) != FALSE, "the chooser stays open after a wrong folder");
-    ExpectText(ChooserPath(chooser), Work("empty\\"), "the path box keeps its text");
+    ExpectText(PathBoxText(chooser), Work("empty\\"), "the path box keeps its text");
 
     OpenBrowserRow(program, chooser, "..", false);
-    Require(WaitForChooserPath(chooser, Work("")), "the parent entry leads back to " + Work(""));
+    Require(WaitForPathBox(chooser, Work("")), "the parent entry leads back to " + Work(""));
     std::string rest = "tree\\" + CatalogueTail;
     for (std::size_t start = 0; start < rest.size();) {
         std::size_t slash = rest.find('\\', start);
         OpenBrowserRow(program, chooser, rest.substr(start, slash - start), false);
         start = slash + 1;
-        Require(WaitForChooserPath(chooser, Work(rest.substr(0, start))),
+        Require(WaitForPathBox(chooser, Work(rest.substr(0, start))),
                 "the browser opens " + rest.substr(0, start));
     }
     SelectBrowserRow(program, chooser, "static.ini");
-    Expect(WaitForChooserPath(chooser, TreeCatalogue() + "static.ini"),
+    Expect(WaitForPathBox(chooser, TreeCatalogue() + "static.ini"),
            "a selected file is shown after its folder");
     ClickButton(Control(chooser, "Button"));
     ConfirmMessage(program, "Path saved", "Path saved in verrant.ini");
@@ -418,6 +426,323 @@ void NoFindingsDisablesProgressList() {
     Expect(Finish(program) == 0, "exit code 0");
 }
 
+// A copy of the repository's demo tree for one scenario: some commands rewrite the catalogue.
+std::string DemoCopy(const std::string& name) {
+    Require(!Settings.demoTree.empty(), "the demo tree is named (" DEMO_TREE_VARIABLE ")");
+    CopyFolder(Settings.demoTree, Work(name));
+    return Work(name + "\\");
+}
+
+struct CliRun {
+    long code = -1;
+    Strings lines;  // its standard output: the progress lines when asked for
+};
+
+CliRun RunCli(const std::string& arguments) {
+    Require(!Settings.cli.empty(), "verrant-cli.exe is named (" CLI_VARIABLE ")");
+    std::string output = Work("cli-output.txt");
+    CliRun run;
+    run.code = RunProcess("\"" + Settings.cli + "\" " + arguments, Work(""), output, 30000);
+    std::string bytes;
+    ReadBytes(output, bytes);
+    for (std::string line : SplitLines(bytes)) {
+        if (!line.empty() && line.back() == '\r') line.pop_back();
+        run.lines.push_back(line);
+    }
+    return run;
+}
+
+std::string FileBytes(const std::string& path) {
+    std::string bytes;
+    Require(ReadBytes(path, bytes), path + " can be read");
+    return bytes;
+}
+
+// A Notepad opens the file and shows its bytes; that Notepad is then ended.
+void ExpectNotepadShows(const std::string& fileName, const std::string& bytes, const Program& program) {
+    HWND notepad = WaitForWindowTitled(fileName + " - ", 10000);
+    if (!Expect(notepad != nullptr, "Notepad opens " + fileName)) return;
+    bool same = false;
+    for (int waited = 0; !same && waited <= 3000; waited += 50) {
+        same = NotepadText(notepad) == bytes;
+        if (!same) Pause(50);
+    }
+    Expect(same, "Notepad shows the bytes of " + fileName + " (" +
+                     std::to_string(NotepadText(notepad).size()) + " characters shown, " +
+                     std::to_string(bytes.size()) + " in the file)");
+    EndProcessesWithWindow(fileName + " - ", program.process.dwProcessId);
+}
+
+// A menu command whose report must be what verrant-cli writes for the same arguments: on the desktop
+// and in Notepad; with the progress list given, its lines are what verrant-cli prints.
+struct ReportCommand {
+    int id;
+    std::string cliArguments;
+    std::string fileName;
+    long cliExit;
+};
+
+void ExpectReportAsCli(Program& program, const ReportCommand& command, HWND progress) {
+    std::string report = DesktopFolder() + command.fileName, folder = Work("cli-reports\\");
+    MakeFolders(folder);
+    DeleteFileA(report.c_str());
+    DeleteFileA((folder + command.fileName).c_str());
+    CliRun run = RunCli(command.cliArguments + (progress ? " --progress" : "") + " --report-dir " + folder);
+    Require(run.code == command.cliExit && (progress == nullptr || !run.lines.empty()),
+            "verrant-cli " + command.cliArguments + " writes " + command.fileName + " (exit " +
+                std::to_string(run.code) + ")");
+    std::string expected = FileBytes(folder + command.fileName);
+    ChooseMenuItem(program, command.id);
+    ExpectNotepadShows(command.fileName, expected, program);
+    std::string written;
+    Expect(ReadBytes(report, written), command.fileName + " is on the desktop");
+    Expect(written == expected, command.fileName + " holds what verrant-cli writes");
+    if (progress != nullptr)
+        ExpectLines(ListLines(ProgressList(progress)), run.lines,
+                    "progress lines of " + command.cliArguments);
+}
+
+// "(", digits, ")", with nothing around them but blanks and tabs.
+bool IsNumberLine(const std::string& line) {
+    std::size_t first = line.find_first_not_of(" \t"), last = line.find_last_not_of(" \t\r");
+    if (first == std::string::npos || last - first < 2) return false;
+    if (line[first] != '(' || line[last] != ')') return false;
+    for (std::size_t i = first + 1; i < last; ++i)
+        if (line[i] < '0' || line[i] > '9') return false;
+    return true;
+}
+
+// ".. missing objects": the window, "OK" without a pick, the demo map, and back to the main window.
+void MissingObjectsWindow() {
+    std::string tree = DemoCopy("demo-map");
+    std::string catalogue = tree + CatalogueTail, mapFolder = tree + "mods\\mapmods\\maps\\Coast\\";
+    std::string report = DesktopFolder() + "Missing_objects.txt";
+    DeleteFileA(report.c_str());
+    MakeFolders(Work("cli-map"));
+    CliRun reference = RunCli("missing-objects --progress --map " + mapFolder +
+                              "actors.static --report-dir " + Work("cli-map"));
+    Require(reference.code == 1, "verrant-cli reports missing objects of the demo map (exit " +
+                                     std::to_string(reference.code) + ")");
+    std::string expected = FileBytes(Work("cli-map\\Missing_objects.txt"));
+    Require(!reference.lines.empty(), "verrant-cli prints the progress lines");
+
+    Program program = Start(FreshStartFolder("map", &catalogue));
+    ClickButton(Control(program.main, "Button", 1));
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the progress list opens");
+    ChooseMenuItem(program, 2);
+    HWND window = WaitForWindow(program, "Searching missing objects");
+    Require(window != nullptr, "\".. missing objects\" opens \"Searching missing objects\"");
+    ExpectFrame(window, 300, 320, 324, 365, "missing objects window");
+    ExpectStyle(window, true, true, "missing objects window");
+    HWND label = Control(window, "Static");
+    ExpectText(WindowText(label), "Select mod maps file of type 'actors.static' to examine",
+               "missing objects label");
+    RECT labelPlace = ChildPlace(label);
+    Expect(labelPlace.left == 10 && labelPlace.top == 10 && labelPlace.right == 284,
+           "the label stands at 10,10 and is 284 wide");
+    ExpectPlace(Control(window, "SysListView32"), 10, 30, 304, 250, "file list");
+    HWND status = Control(window, "Edit");
+    ExpectPlace(status, 10, 300, 304, 20, "status line");
+    Expect((GetWindowLongA(status, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) != 0, "the status line is sunken");
+    ExpectText(WindowText(status), "", "status line at first");
+    HWND close = Control(window, "Button", 0), ok = Control(window, "Button", 1);
+    ExpectText(WindowText(close), "Close", "first button");
+    ExpectPlace(close, 10, 330, 50, 25, "\"Close\"");
+    ExpectText(WindowText(ok), "OK", "second button");
+    ExpectPlace(ok, 289, 330, 25, 25, "\"OK\"");
+    Strings rows = SplitLines(Probe(program, window, ProbeRows));
+    ExpectText(rows.empty() ? "" : rows[0], "columns\tName\tType\tModified", "file list columns");
+    ExpectLines(BrowserRowNames(program, window), {"..", "Coast"}, "the file list opens on the maps folder");
+    ExpectCaptionsFit(program, window, "missing objects window");
+
+    ClickButton(ok);
+    Expect(WaitForPathBox(window, "No file selected"),
+           "\"OK\" with nothing picked shows \"No file selected\"");
+    Pause(200);
+    Expect(!MessageBoxShown(program), "\"OK\" with nothing picked shows no message box");
+
+    OpenBrowserRow(program, window, "Coast", false);
+    Strings mapRows;
+    for (int waited = 0; waited <= 5000 && mapRows != Strings{"..", "actors.static"}; waited += 100) {
+        if (waited > 0) Pause(100);
+        mapRows = BrowserRowNames(program, window);
+    }
+    ExpectLines(mapRows, {"..", "actors.static"}, "the map folder's rows");
+    SelectBrowserRow(program, window, "actors.static");
+    std::string picked = mapFolder + "actors.static";
+    std::string shown = picked.size() <= 43 ? picked : "..." + picked.substr(picked.size() - 40);
+    Expect(WaitForPathBox(window, shown),
+           "the status line shows the pick cut to 43 characters: \"" + PathBoxText(window) + "\"");
+    Screenshot("missing-objects");
+
+    ClickButton(ok);
+    ExpectNotepadShows("Missing_objects.txt", expected, program);
+    std::string written;
+    Expect(ReadBytes(report, written), "Missing_objects.txt is on the desktop");
+    Expect(written == expected, "Missing_objects.txt holds what verrant-cli writes for the same map");
+    ExpectLines(ListLines(ProgressList(progress)), reference.lines, "progress lines of the map check");
+    Expect(!MessageBoxShown(program), "a check with findings shows no message box");
+    Expect(IsWindowVisible(window) != FALSE, "the window stays open after a check");
+
+    ClickButton(close);
+    Expect(WaitUntilGone(window), "\"Close\" closes the window");
+    ChooseMenuItem(program, 12);  // the main window's commands run again
+    ConfirmMessage(program, "Path cleared", "verrant.ini deleted");
+    PressCloseBox(program.main);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// Renumbering and denumbering a copy of the demo catalogue, then both mission-builder lists, each
+// against verrant-cli on a second copy.
+void RewriteAndLists() {
+    std::string catalogue = DemoCopy("demo-rewrite") + CatalogueTail;
+    std::string reference = DemoCopy("demo-rewrite-cli") + CatalogueTail;
+    std::string original = FileBytes(catalogue + "static.ini");
+
+    Program program = Start(FreshStartFolder("rewrite", &catalogue));
+    ClickButton(Control(program.main, "Button", 1));
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the progress list opens");
+
+    CliRun renumbered = RunCli("renumber --progress --catalogue " + reference);
+    Require(renumbered.code == 0 && !renumbered.lines.empty(),
+            "verrant-cli renumbers its copy, printing the progress lines");
+    ChooseMenuItem(program, 6);
+    ConfirmMessage(program, "Renumber static.ini", "Done");
+    std::string after = FileBytes(catalogue + "static.ini");
+    Expect(after == FileBytes(reference + "static.ini"), "the renumbered catalogue is verrant-cli's");
+    Expect(after != original && after.find("(0)\r\n[buildings.House$Signpost]\r\n") != std::string::npos,
+           "renumbering puts (0) above the first building header");
+    Expect(!FileExists(catalogue + "static.ini.tmp"), "no static.ini.tmp is left");
+    ExpectLines(ListLines(ProgressList(progress)), renumbered.lines, "progress lines of renumbering");
+
+    CliRun denumbered = RunCli("denumber --progress --catalogue " + reference);
+    Require(denumbered.code == 0 && !denumbered.lines.empty(),
+            "verrant-cli denumbers its copy, printing the progress lines");
+    ChooseMenuItem(program, 7);
+    ConfirmMessage(program, "Denumber static.ini", "Done");
+    after = FileBytes(catalogue + "static.ini");
+    Expect(after == FileBytes(reference + "static.ini"), "the denumbered catalogue is verrant-cli's");
+    Strings lines = SplitLines(after);
+    Expect(std::none_of(lines.begin(), lines.end(), IsNumberLine), "no number line is left");
+    Expect(!FileExists(catalogue + "static.ini.tmp"), "no static.ini.tmp is left");
+    ExpectLines(ListLines(ProgressList(progress)), denumbered.lines, "progress lines of denumbering");
+
+    ExpectReportAsCli(program, {8, "fmb-list --catalogue " + reference, "Static_list_FMB.txt", 0}, nullptr);
+    ExpectReportAsCli(program, {9, "fmb-plus-list --catalogue " + reference, "Static_list_FMBplus.txt", 0},
+                      nullptr);
+    Expect(!MessageBoxShown(program), "the lists show no message box");
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// "Open static.ini": Notepad on the catalogue, started by its bare name in the catalogue folder.
+// A list written first leaves the desktop current, where a decoy static.ini waits for a Notepad
+// started without its working folder.
+void OpenCatalogueButton() {
+    std::string tree = TreeCatalogue(), decoy = DesktopFolder() + "static.ini";
+    WriteBytes(decoy, "decoy\r\n");
+    Program program = Start(FreshStartFolder("open", &tree));
+    ChooseMenuItem(program, 8);
+    Expect(WaitForWindowTitled("Static_list_FMB.txt - ", 10000) != nullptr, "the list opens in Notepad");
+    EndProcessesWithWindow("Static_list_FMB.txt - ", program.process.dwProcessId);
+    ClickButton(Control(program.main, "Button", 0));
+    ExpectNotepadShows("static.ini", FileBytes(tree + "static.ini"), program);
+    Expect(!MessageBoxShown(program), "no message box");
+    DeleteFileA(decoy.c_str());
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// Both mesh reference commands on the demo tree, against verrant-cli on the same tree.
+void MeshReferencesOnDemoTree() {
+    std::string catalogue = DemoCopy("demo-mesh") + CatalogueTail;
+    Program program = Start(FreshStartFolder("mesh", &catalogue));
+    ClickButton(Control(program.main, "Button", 1));
+    HWND progress = WaitForWindow(program, "List searching window");
+    Require(progress != nullptr, "the progress list opens");
+    ExpectReportAsCli(program, {5, "wrong-sim-references --catalogue " + catalogue, "Missing_3do.txt", 1},
+                      progress);
+    Expect(FindProgramWindow(program, "Wait") == nullptr, "the Wait window is closed once the report opens");
+    ExpectReportAsCli(program,
+                      {14, "doubled-used-sims --catalogue " + catalogue, "Doubled_sims_or_meshes.txt", 1},
+                      progress);
+    Expect(!MessageBoxShown(program), "the mesh checks show no message box");
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
+// Many mods and many entries keep the mesh search, and with it the Wait window, busy for a while.
+const int BigTreeEntries = 20000, BigTreeMods = 300;
+
+std::string MakeBigMeshTree() {
+    std::string root = Work("mesh-big\\"), catalogue = root + CatalogueTail;
+    MakeFolders(catalogue);
+    std::string text = "[***]\r\nTitle Generated\r\n";
+    for (int i = 0; i < BigTreeEntries; ++i)
+        text += "[buildings.House$Gen" + std::to_string(i) + "]\r\nMesh 3do/Gen/F" + std::to_string(i % 100) +
+                "/m" + std::to_string(i) + ".sim\r\n";
+    WriteBytes(catalogue + "static.ini", text);
+    for (int m = 0; m < BigTreeMods; ++m)
+        MakeFolders(root + "mods\\Mod" + std::to_string(m) + "\\3do\\Gen\\F" + std::to_string(m % 100));
+    return catalogue;
+}
+
+// The Wait window of ".. wrong sim references": caption only, its place and size, a moving bar.
+void WaitWindowDuringLongRun() {
+    std::string catalogue = MakeBigMeshTree();
+    std::string report = DesktopFolder() + "Missing_3do.txt";
+    DeleteFileA(report.c_str());
+    Program program = Start(FreshStartFolder("mesh-big", &catalogue));
+    ChooseMenuItem(program, 5);
+    HWND wait = nullptr;
+    LARGE_INTEGER frequency, began, seenAt, gone;
+    QueryPerformanceFrequency(&frequency);
+    QueryPerformanceCounter(&began);
+    for (int waited = 0; wait == nullptr && waited < 10000; waited += 5) {
+        wait = FindProgramWindow(program, "Wait");
+        if (wait == nullptr) Pause(5);
+    }
+    Require(wait != nullptr, "the Wait window appears during the run");
+    QueryPerformanceCounter(&seenAt);
+    ExpectFrame(wait, 400, 340, 180, 40, "Wait window");
+    LONG style = GetWindowLongA(wait, GWL_STYLE);
+    Expect((style & WS_CAPTION) == WS_CAPTION, "the Wait window has a title bar");
+    Expect((style & (WS_SYSMENU | WS_THICKFRAME | WS_MINIMIZEBOX | WS_MAXIMIZEBOX)) == 0,
+           "the Wait window has no system menu, close box or sizing border");
+    HWND bar = Control(wait, "msctls_progress32");
+    Require(bar != nullptr, "the Wait window holds a progress bar");
+    ExpectPlace(bar, 10, 10, 160, 20, "progress bar");
+    Screenshot("wait-window");
+    DWORD_PTR low = 99, high = 0, position = 0, highest = 0;
+    SendMessageTimeoutW(bar, PBM_GETRANGE, TRUE, 0, SMTO_NORMAL, 5000, &low);
+    SendMessageTimeoutW(bar, PBM_GETRANGE, FALSE, 0, SMTO_NORMAL, 5000, &high);
+    Expect(low == 0 && high == 35,
+           "the bar runs from 0 to 35: " + std::to_string(low) + ".." + std::to_string(high));
+    while (IsWindow(wait) && IsWindowVisible(wait)) {
+        if (SendMessageTimeoutW(bar, PBM_GETPOS, 0, 0, SMTO_NORMAL, 1000, &position))
+            highest = std::max(highest, position);
+        Pause(20);
+    }
+    QueryPerformanceCounter(&gone);
+    Expect(highest > 0 && highest <= 35,
+           "the bar moves within its range: highest " + std::to_string(highest));
+    std::printf("    the Wait window was seen %.0f ms after the command and stayed %.0f ms\n",
+                1000.0 * static_cast<double>(seenAt.QuadPart - began.QuadPart) / frequency.QuadPart,
+                1000.0 * static_cast<double>(gone.QuadPart - seenAt.QuadPart) / frequency.QuadPart);
+    HWND notepad = WaitForWindowTitled("Missing_3do.txt - ", 20000);
+    Expect(notepad != nullptr, "Notepad opens Missing_3do.txt");
+    std::string written;
+    Expect(ReadBytes(report, written) &&
+               written.find("Wrong sim references in your static.ini:\r\n\r\n") != std::string::npos &&
+               written.find("Gen" + std::to_string(BigTreeEntries - 1)) != std::string::npos,
+           "Missing_3do.txt lists the generated entries");
+    EndProcessesWithWindow("Missing_3do.txt - ", program.process.dwProcessId);
+    ChooseMenuItem(program, 1);
+    Expect(Finish(program) == 0, "exit code 0");
+}
+
 // The program file carries its version and its icon.
 void ProgramFileResources() {
     DWORD ignored = 0;
@@ -453,6 +778,9 @@ int main(int argc, char** argv) {
     Settings.workRoot = argv[3];
     if (Settings.workRoot.back() != '\\') Settings.workRoot += '\\';
     if (argc > 4) Settings.shotsFolder = std::string(argv[4]) + "\\";
+    char value[MAX_PATH] = "";
+    if (GetEnvironmentVariableA(DEMO_TREE_VARIABLE, value, sizeof value)) Settings.demoTree = value;
+    if (GetEnvironmentVariableA(CLI_VARIABLE, value, sizeof value)) Settings.cli = value;
     SetEnvironmentVariableA(PROBE_FILE_VARIABLE, (Settings.workRoot + "probe-answer.txt").c_str());
     SetErrorMode(SEM_FAILCRITICALERRORS | SEM_NOOPENFILEERRORBOX);
     MakeFolders(Settings.workRoot);
@@ -469,6 +797,12 @@ int main(int argc, char** argv) {
         {"doubled objects: progress list lines, report on the desktop, Notepad; toggle off and on",
          DoubledObjectsWithProgressList},
         {"no findings: message box disables the progress list", NoFindingsDisablesProgressList},
+        {"missing objects: window, no pick, the demo map's report and progress lines, Close",
+         MissingObjectsWindow},
+        {"renumber and denumber the demo catalogue; both mission-builder lists", RewriteAndLists},
+        {"\"Open static.ini\" starts Notepad on the catalogue", OpenCatalogueButton},
+        {"wrong sim references and doubled used sims on the demo tree", MeshReferencesOnDemoTree},
+        {"the Wait window during a long mesh search", WaitWindowDuringLongRun},
     };
     int passed = 0, failed = 0;
     for (const Scenario& scenario : scenarios) {

@@ -419,6 +419,54 @@ void MakeFolders(const std::string& folder) {
     CreateDirectoryA(folder.c_str(), nullptr);
 }
 
+void CopyFolder(const std::string& from, const std::string& to) {
+    MakeFolders(to);
+    WIN32_FIND_DATAA entry;
+    HANDLE search = FindFirstFileA((from + "\\*").c_str(), &entry);
+    Require(search != INVALID_HANDLE_VALUE, "can list " + from);
+    do {
+        std::string name = entry.cFileName;
+        if (name == "." || name == "..") continue;
+        std::string source = from + "\\" + name, target = to + "\\" + name;
+        if (entry.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY)
+            CopyFolder(source, target);
+        else
+            Require(CopyFileA(source.c_str(), target.c_str(), FALSE) != FALSE, "can copy " + source);
+    } while (FindNextFileA(search, &entry));
+    FindClose(search);
+}
+
+long RunProcess(const std::string& commandLine, const std::string& folder, const std::string& outputPath,
+                int milliseconds) {
+    SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
+    HANDLE output = CreateFileA(outputPath.c_str(), GENERIC_WRITE, FILE_SHARE_READ, &inherited, CREATE_ALWAYS,
+                                FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (output == INVALID_HANDLE_VALUE) return -1;
+    STARTUPINFOA startup = {};
+    startup.cb = sizeof startup;
+    startup.dwFlags = STARTF_USESTDHANDLES;
+    startup.hStdInput = GetStdHandle(STD_INPUT_HANDLE);
+    startup.hStdOutput = output;
+    startup.hStdError = GetStdHandle(STD_ERROR_HANDLE);
+    PROCESS_INFORMATION process = {};
+    std::string line = commandLine;
+    bool started = CreateProcessA(nullptr, line.data(), nullptr, nullptr, TRUE, 0, nullptr, folder.c_str(),
+                                  &startup, &process) != FALSE;
+    CloseHandle(output);
+    if (!started) return -1;
+    DWORD code = 0;
+    bool ended = WaitForSingleObject(process.hProcess, static_cast<DWORD>(milliseconds)) == WAIT_OBJECT_0;
+    if (ended) {
+        GetExitCodeProcess(process.hProcess, &code);
+    } else {
+        TerminateProcess(process.hProcess, 99);
+        WaitForSingleObject(process.hProcess, 5000);
+    }
+    CloseHandle(process.hThread);
+    CloseHandle(process.hProcess);
+    return ended ? static_cast<long>(code) : -1;
+}
+
 int EndProcessesWithWindow(const std::string& titlePart, DWORD sparedProcess) {
     TitleSearch search;
     search.part = titlePart;
@@ -444,3 +492,5 @@ HWND WaitForWindowTitled(const std::string& titlePart, int milliseconds) {
         Sleep(PollMilliseconds);
     }
 }
+
+std::string NotepadText(HWND notepad) { return WindowText(FindWindowExA(notepad, nullptr, "Edit", nullptr)); }

@@ -28,6 +28,8 @@ struct DriverSettings {
     std::string probeLibrary;  // the probe DLL
     std::string workRoot;      // fixtures and start folders, ending in "\"
     std::string shotsFolder;   // "" for no screenshots
+    std::string demoTree;      // the repository's demo tree, copied before use
+    std::string cli;           // verrant-cli.exe, the reference for reports and rewritten catalogues
 };
 extern DriverSettings Settings;
 
@@ -88,7 +90,15 @@ void WriteBytes(const std::string& path, const std::string& bytes);
 bool ReadBytes(const std::string& path, std::string& bytes);
 bool FileExists(const std::string& path);
 void MakeFolders(const std::string& folder);
+// Copies a folder with everything below it; the target is made when missing.
+void CopyFolder(const std::string& from, const std::string& to);
+// Runs a command line in a folder with its standard output into a file; the exit code, or -1 when it
+// did not start or end in time.
+long RunProcess(const std::string& commandLine, const std::string& folder, const std::string& outputPath,
+                int milliseconds);
 // Ends processes other than the program whose top-level window title holds the text (Notepad).
 int EndProcessesWithWindow(const std::string& titlePart, DWORD sparedProcess);
 HWND WaitForWindowTitled(const std::string& titlePart, int milliseconds);
+// The text that a Notepad window shows.
+std::string NotepadText(HWND notepad);
 void Pause(int milliseconds);

@@ -11,10 +11,11 @@ build="$top/build/mingw"
 program="${VERRANT_EXE:-$build/src/verrant.exe}"
 driver="$build/tests/e2e/e2e_driver.exe"
 probe="$build/tests/e2e/e2e_probe.dll"
+cli="$build/src/verrant-cli.exe"
 e2e="$top/build/e2e"
 shots="$top/build/e2e-shots"
 
-for file in "$program" "$driver" "$probe"; do
+for file in "$program" "$driver" "$probe" "$cli"; do
     if [ ! -f "$file" ]; then
         echo "missing $file (build the MinGW configuration first)"
         echo "0 passed, 1 failed"
@@ -98,6 +99,8 @@ echo "prefix ready in $(($(date +%s) - started)) s"
 ) &
 watcher_pid=$!
 
+# Scenarios copy the demo tree before use, and check reports against verrant-cli.exe's.
+export VERRANT_E2E_DEMO_TREE="$(windows_path "$top/examples/demo-tree")" VERRANT_E2E_CLI="$(windows_path "$cli")"
 # Wine processes inherit the driver's output: a file, so no pipe stays open behind them.
 started=$(date +%s)
 timeout 600 wine "$driver" "$(windows_path "$program")" "$(windows_path "$probe")" 'C:\verrant-e2e' \

@@ -159,3 +159,18 @@ TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {
         EXPECT_NE(Flags(index).find('1'), std::string::npos) << "seed " << seed;
     }
 }
+
+// Mod folders come in the order in which NTFS lists them: names compared as upper case, so "_" and
+// "[" sort after every letter.
+TEST_F(MeshFolderSearchTest, ModFoldersInTheOrderNtfsListsThem) {
+    for (const std::string mod : {"_Late", "zeta", "Alpha", "[x]", "beta"})
+        Write("Game/mods/" + mod + "/3do/a", "");
+    ProgressListOn = true;
+    OpenProgressList();
+    std::vector<MeshIndexEntry> index;
+    SearchModMeshFolders(index, ModsRoot(), NewBar());
+    Strings expected;
+    for (const std::string mod : {"Alpha", "beta", "zeta", "[x]", "_Late"})
+        expected.push_back("Check: ...\\mods\\" + mod + "\\3do");
+    EXPECT_EQ(ProgressLines(), expected);
+}

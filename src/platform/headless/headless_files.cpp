@@ -41,11 +41,14 @@ bool SameIgnoringCase(const std::string& a, const std::string& b) {
     return true;
 }
 
+char UpperAscii(char c) { return (c >= 'a' && c <= 'z') ? static_cast<char>(c - 'a' + 'A') : c; }
+
+// As NTFS orders names: by their upper case, so "_" and "[" come after the letters.
 bool LessIgnoringCase(const std::string& a, const std::string& b) {
     std::size_t n = std::min(a.size(), b.size());
     for (std::size_t i = 0; i < n; ++i) {
-        unsigned char x = static_cast<unsigned char>(LowerAscii(a[i]));
-        unsigned char y = static_cast<unsigned char>(LowerAscii(b[i]));
+        unsigned char x = static_cast<unsigned char>(UpperAscii(a[i]));
+        unsigned char y = static_cast<unsigned char>(UpperAscii(b[i]));
         if (x != y) return x < y;
     }
     if (a.size() != b.size()) return a.size() < b.size();
