@@ -71,10 +71,5 @@ CommandResult FindMissingMapObjects(const std::string& selection, const std::str
         ShowMessage("No missing objects found", "All maps objects found in your static.ini");
         return CommandResult::NothingFound;
     }
-    ReportFile report;
-    if (!CreateReport("Missing_objects.txt", report)) return CommandResult::Failed;
-    WriteReportLine(report, "Missing objects in your static.ini:");
-    WriteReportLine(report, "");
-    for (const std::string& name : missing) WriteReportLine(report, name);
-    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+    return WriteFindingsReport("Missing_objects.txt", "Missing objects in your static.ini:", missing);
 }
