@@ -9,104 +9,85 @@
 // Bytes in, bytes out: no decoding and no limit on a line's length.
 #include "catalogue/catalogue_reader.h"
 
+#include "platform/platform.h"
+
 #include <cstring>
 
-namespace {
+LineReader LinesOf(const std::string& bytes) { return {&bytes, 0}; }
 
-const std::size_t ReadBlockSize = 1 << 16;
-
-// Makes at least one unread byte available; false at the end of the file.
-bool Refill(CatalogueReader& reader) {
-    if (reader.position < reader.filled) return true;
-    if (reader.exhausted || reader.file == 0) return false;
-    reader.buffer.resize(ReadBlockSize + 1);
-    reader.filled = ReadBytes(reader.file, reader.buffer.data(), ReadBlockSize);
-    reader.buffer[reader.filled] = '\0';  // stops the line scan at the end of the block
-    reader.position = 0;
-    if (reader.filled == 0) {
-        reader.exhausted = true;
-        reader.failed = ReadHasFailed(reader.file);
-    }
-    return reader.filled > 0;
-}
-
-}  // namespace
-
-bool OpenCatalogue(const std::string& folder, CatalogueReader& reader, const std::string& fileName) {
-    reader = CatalogueReader();
-    if (!MakeFolderCurrent(folder)) return false;
-    reader.file = OpenForReading(fileName);
-    return reader.file != 0;
-}
-
-void CloseCatalogue(CatalogueReader& reader) {
-    if (reader.file != 0) CloseFile(reader.file);
-    reader.file = 0;
-    reader.exhausted = true;
-}
-
-bool AtCatalogueEnd(CatalogueReader& reader) { return !Refill(reader); }
-
-bool NextPhysicalLine(CatalogueReader& reader, std::string& line) {
-    line.clear();
-    if (!Refill(reader)) return false;
-    for (;;) {
-        const char* start = reader.buffer.data() + reader.position;
-        const char* stop = reader.buffer.data() + reader.filled;
-        // strcspn stops at CR, at LF and at NUL, the three line ends, and is much faster than a
-        // loop over the bytes; the NUL after the block makes a scan that reaches stop.
-        const char* end = start + std::strcspn(start, "\r\n");
-        line.append(start, end);
-        reader.position += static_cast<std::size_t>(end - start);
-        if (end != stop) break;
-        if (!Refill(reader)) return true;
-    }
-    char ending = reader.buffer[reader.position++];
-    if (ending == '\r' && Refill(reader) && reader.buffer[reader.position] == '\n') ++reader.position;
+bool NextPhysicalLine(LineReader& reader, std::string_view& line) {
+    const std::string& bytes = *reader.bytes;
+    if (reader.position >= bytes.size()) return false;
+    // strcspn stops at CR, at LF and at NUL, the three line ends, and is much faster than a loop
+    // over the bytes; the string's own terminating NUL stops a scan that reaches its end.
+    const char* start = bytes.data() + reader.position;
+    std::size_t length = std::strcspn(start, "\r\n");
+    line = std::string_view(start, length);
+    reader.position += length;
+    if (reader.position == bytes.size()) return true;
+    char ending = bytes[reader.position++];
+    if (ending == '\r' && reader.position < bytes.size() && bytes[reader.position] == '\n') ++reader.position;
     return true;
 }
 
-bool NextCatalogueLine(CatalogueReader& reader, std::string& line) {
+bool NextCatalogueLine(LineReader& reader, std::string_view& line) {
     if (!NextPhysicalLine(reader, line)) return false;
-    TrimBlanksInPlace(line);
+    line = TrimBlanks(line);
     return true;
 }
 
-void TrimBlanksInPlace(std::string& line) {
-    std::size_t first = line.find_first_not_of(' ');
-    if (first == std::string::npos) {
-        line.clear();
-        return;
+FileRead ReadWholeFile(const std::string& folder, const std::string& fileName, std::string& bytes) {
+    const std::size_t blockSize = 1 << 16;
+    bytes.clear();
+    if (!MakeFolderCurrent(folder)) return FileRead::NotOpened;
+    Handle file = OpenForReading(fileName);
+    if (file == 0) return FileRead::NotOpened;
+    for (;;) {
+        std::size_t filled = bytes.size();
+        bytes.resize(filled + blockSize);
+        std::size_t got = ReadBytes(file, bytes.data() + filled, blockSize);
+        bytes.resize(filled + got);
+        if (got == 0) break;
     }
-    line.erase(line.find_last_not_of(' ') + 1);
-    line.erase(0, first);
+    bool failed = ReadHasFailed(file);
+    CloseFile(file);
+    return failed ? FileRead::FailedPartway : FileRead::Whole;
 }
 
-std::string TrimBlanks(const std::string& line) {
-    std::string trimmed = line;
-    TrimBlanksInPlace(trimmed);
-    return trimmed;
+std::string_view TrimBlanks(std::string_view line) {
+    std::size_t first = line.find_first_not_of(' ');
+    if (first == std::string_view::npos) return {};
+    return line.substr(first, line.find_last_not_of(' ') + 1 - first);
 }
 
-bool IsBuildingHeader(const std::string& line) { return line.compare(0, 4, "[bui") == 0; }
+bool IsBuildingHeader(std::string_view line) { return line.substr(0, 4) == "[bui"; }
 
-std::string SectionNameByBracket(const std::string& header) {
-    if (header.empty()) return "";
+std::string_view SectionNameByBracket(std::string_view header) {
+    if (header.empty()) return {};
     std::size_t bracket = header.find(']', 1);
-    return header.substr(1, bracket == std::string::npos ? std::string::npos : bracket - 1);
+    return header.substr(1, bracket == std::string_view::npos ? std::string_view::npos : bracket - 1);
 }
 
-std::string SectionNameByEnds(const std::string& header) {
-    if (header.size() < 2) return "";
+std::string_view SectionNameByEnds(std::string_view header) {
+    if (header.size() < 2) return {};
     return header.substr(1, header.size() - 2);
 }
 
 // A header without "$" gives the whole line less its last character.
-std::string ObjectNameOf(const std::string& header) {
+std::string_view ObjectNameOf(std::string_view header) {
     std::size_t dollar = header.find('$');
-    std::size_t start = dollar == std::string::npos ? 0 : dollar + 1;
+    std::size_t start = dollar == std::string_view::npos ? 0 : dollar + 1;
     std::size_t next = header.find('$', start);
-    std::string name = header.substr(start, next == std::string::npos ? std::string::npos : next - start);
-    if (!name.empty()) name.pop_back();
+    std::string_view name = header.substr(start, next == std::string_view::npos ? std::string_view::npos : next - start);
+    if (!name.empty()) name.remove_suffix(1);
     return name;
+}
+
+std::vector<std::string_view> BuildingSectionNames(const std::string& catalogue) {
+    std::vector<std::string_view> names;
+    LineReader reader = LinesOf(catalogue);
+    std::string_view line;
+    while (NextCatalogueLine(reader, line))
+        if (IsBuildingHeader(line)) names.push_back(SectionNameByBracket(line));
+    return names;
 }

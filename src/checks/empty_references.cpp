@@ -1,56 +1,51 @@
 #include "checks/empty_references.h"
 
-#include "checks/catalogue_opening.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
-#include "shell/reports.h"
-
-namespace {
-
-const std::string NothingFoundLine = "No empty references found in your static.ini";
-
-}  // namespace
+#include "catalogue/catalogue_reader.h"
+#include "output/app_state.h"
+#include "output/catalogue_loading.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
+#include "output/reports.h"
 
 // Whole-line equality: the key followed by anything but blanks names a mesh, or at least something.
-std::string EmptyReferenceKey(const std::string& line) {
-    if (line == "Mesh" || line == "MeshLive" || line == "MeshDead") return line;
-    return "";
+std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue) {
+    std::vector<EmptyReference> found;
+    EmptyReference reference;
+    LineReader reader = LinesOf(catalogue);
+    std::string_view line;
+    while (NextCatalogueLine(reader, line)) {
+        if (IsBuildingHeader(line)) {
+            ++reference.objectNumber;
+            reference.sectionName = SectionNameByEnds(line);
+        } else if (line == "Mesh" || line == "MeshLive" || line == "MeshDead") {
+            reference.key = line;
+            found.push_back(reference);
+        }
+    }
+    return found;
 }
 
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
-    return {std::string(14, '*'), "Object " + std::to_string(reference.objectNumber), reference.sectionName,
-            "Empty reference: " + reference.key};
+    return {std::string(14, '*'), "Object " + std::to_string(reference.objectNumber),
+            std::string(reference.sectionName), "Empty reference: " + std::string(reference.key)};
 }
 
 CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
-    CatalogueReader reader;
-    if (!OpenCatalogueForCheck(catalogueFolder, reader)) return CommandResult::Failed;
+    const std::string nothingFound = "No empty references found in your static.ini";
+    std::string catalogue;
+    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
     if (ProgressListOn) {
         ClearProgressList();
         AddProgressLine("Empty references in your Static.ini");
         AddProgressLine(" ");
     }
     ReportFile report;
-    if (!CreateReport("Empty_references.txt", report)) {
-        CloseCatalogue(reader);
-        return CommandResult::Failed;
-    }
+    if (!CreateReport("Empty_references.txt", report)) return CommandResult::Failed;
     WriteReportLine(report, "Empty references in your static.ini");
     WriteReportLine(report, "");
 
-    EmptyReference reference;
-    bool found = false;
-    std::string line;
-    while (NextCatalogueLine(reader, line)) {
-        if (IsBuildingHeader(line)) {
-            ++reference.objectNumber;
-            reference.sectionName = SectionNameByEnds(line);
-            continue;
-        }
-        reference.key = EmptyReferenceKey(line);
-        if (reference.key.empty()) continue;
-        found = true;
+    std::vector<EmptyReference> found = FindEmptyReferenceLines(catalogue);
+    for (const EmptyReference& reference : found) {
         std::vector<std::string> lines = EmptyReferenceLines(reference);
         if (ProgressListOn) {
             DrainPendingEvents();
@@ -61,11 +56,10 @@ CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
         for (std::size_t i = reference.key == "Mesh" ? 0 : 1; i < lines.size(); ++i)
             WriteReportLine(report, lines[i]);
     }
-    if (!found) {
-        if (ProgressListOn) AddProgressLine(NothingFoundLine);
-        WriteReportText(report, NothingFoundLine);
+    if (found.empty()) {
+        if (ProgressListOn) AddProgressLine(nothingFound);
+        WriteReportText(report, nothingFound);
     }
-    CloseCatalogue(reader);
     if (!FinishReport(report)) return CommandResult::Failed;
-    return found ? CommandResult::Findings : CommandResult::NothingFound;
+    return found.empty() ? CommandResult::NothingFound : CommandResult::Findings;
 }

@@ -1,19 +1,20 @@
 // ".. empty references": "Mesh", "MeshLive" and "MeshDead" lines that hold the key alone.
 #pragma once
 
-#include "shell/command_result.h"
+#include "output/command_result.h"
 
 #include <string>
+#include <string_view>
 #include <vector>
 
 struct EmptyReference {
-    int objectNumber = -1;    // -1 before the first building header
-    std::string sectionName;  // end cut of that header; "" before the first
-    std::string key;
+    int objectNumber = -1;         // -1 before the first building header
+    std::string_view sectionName;  // end cut of that header; "" before the first
+    std::string_view key;
 };
 
-// The key when the line is a mesh key alone, "" otherwise.
-std::string EmptyReferenceKey(const std::string& line);
+// Every mesh key that stands alone on its line, in file order.
+std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue);
 // The finding's lines as the progress list shows them: a ruler, the object, the section, the key.
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference);
 

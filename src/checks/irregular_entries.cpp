@@ -1,15 +1,14 @@
 #include "checks/irregular_entries.h"
 
-#include "checks/catalogue_opening.h"
+#include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
-#include "location/catalogue_folder.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
-#include "shell/reports.h"
+#include "output/app_state.h"
+#include "output/catalogue_loading.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
+#include "output/reports.h"
 
 #include <array>
-#include <vector>
 
 namespace {
 
@@ -39,13 +38,31 @@ const std::string_view RegularLinePrefixes[] = {
     "[buildings.Mountain$",
 };
 
-const std::string Ruler41(41, '*');
+void ListJudgedLines(const std::vector<JudgedLine>& judged) {
+    const std::string ruler(41, '*');
+    std::size_t regular = 0;
+    for (const JudgedLine& entry : judged) {
+        DrainPendingEvents();
+        if (!entry.prefix.empty()) {
+            ++regular;
+            AddProgressLine("Reg: " + std::string(entry.prefix) + " => " + std::string(entry.line));
+            continue;
+        }
+        AddProgressLine(ruler);
+        AddProgressLine("Irregular entry towards object (" + std::to_string(entry.objectNumber) +
+                        "): " + std::string(entry.line));
+        AddProgressLine(ruler);
+    }
+    AddProgressLine(" ");
+    AddProgressLine("Regular lines: " + std::to_string(regular));
+    AddProgressLine("Irregular lines: " + std::to_string(judged.size() - regular));
+}
 
 }  // namespace
 
 // A line is tried only against the prefixes that begin with its first byte, in table order; no
 // other prefix can match it, so the first that does is still the first of the whole table.
-std::string_view RegularLinePrefixOf(const std::string& line) {
+std::string_view RegularLinePrefixOf(std::string_view line) {
     static const std::array<std::vector<std::string_view>, 256> byFirstByte = [] {
         std::array<std::vector<std::string_view>, 256> table;
         for (std::string_view prefix : RegularLinePrefixes)
@@ -54,54 +71,39 @@ std::string_view RegularLinePrefixOf(const std::string& line) {
     }();
     if (line.empty()) return {};
     for (std::string_view prefix : byFirstByte[static_cast<unsigned char>(line[0])])
-        if (line.compare(0, prefix.size(), prefix) == 0) return prefix;
+        if (StartsWith(line, prefix)) return prefix;
     return {};
 }
 
-std::string IrregularEntryLine(const IrregularEntry& entry) {
-    return "Irregular entry towards object " + std::to_string(entry.objectNumber) + ": " + entry.line;
-}
-
-CommandResult CheckIrregularEntries() {
-    EnsureCatalogueFolder();
-    if (CatalogueFolder.empty()) return CommandResult::NoFolder;
-    CatalogueReader reader;
-    if (!OpenCatalogueForCheck(CatalogueFolder, reader)) return CommandResult::Failed;
-    if (ProgressListOn) ClearProgressList();
-
-    std::vector<std::string> irregulars;  // their report lines
-    int entryNumber = 0, regularCount = 0;
-    std::string line;
+std::vector<JudgedLine> JudgeCatalogueLines(const std::string& catalogue, bool keepRegular) {
+    std::vector<JudgedLine> judged;
+    int objectNumber = 0;
+    LineReader reader = LinesOf(catalogue);
+    std::string_view line;
     while (NextCatalogueLine(reader, line)) {
         // Five characters, one more than a building header needs: "[bui" alone opens no entry here.
-        if (StartsWith(line, "[buil")) ++entryNumber;
-        if (std::string_view prefix = RegularLinePrefixOf(line); !prefix.empty()) {
-            ++regularCount;
-            if (ProgressListOn) {
-                DrainPendingEvents();
-                AddProgressLine("Reg: " + std::string(prefix) + " => " + line);
-            }
-        } else if (!line.empty()) {
-            irregulars.push_back(IrregularEntryLine({entryNumber, line}));
-            if (ProgressListOn) {
-                DrainPendingEvents();
-                AddProgressLine(Ruler41);
-                AddProgressLine("Irregular entry towards object (" + std::to_string(entryNumber) +
-                                "): " + line);
-                AddProgressLine(Ruler41);
-            }
-        }
+        if (StartsWith(line, "[buil")) ++objectNumber;
+        std::string_view prefix = RegularLinePrefixOf(line);
+        if (prefix.empty() ? !line.empty() : keepRegular) judged.push_back({objectNumber, prefix, line});
     }
-    if (ProgressListOn) {
-        AddProgressLine(" ");
-        AddProgressLine("Regular lines: " + std::to_string(regularCount));
-        AddProgressLine("Irregular lines: " + std::to_string(irregulars.size()));
-    }
-    CloseCatalogue(reader);
+    return judged;
+}
 
-    if (irregulars.empty()) {
-        ShowMessage("No irregular objects", "No irregular objects found in your static.ini");
-        return CommandResult::NothingFound;
-    }
-    return WriteFindingsReport("Irregular_entrys.txt", "Irregular entrys in your static.ini:", irregulars);
+std::string IrregularEntryLine(const JudgedLine& entry) {
+    return "Irregular entry towards object " + std::to_string(entry.objectNumber) + ": " + std::string(entry.line);
+}
+
+CommandResult CheckIrregularEntries(const std::string& catalogueFolder) {
+    std::string catalogue;
+    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    if (ProgressListOn) ClearProgressList();
+    std::vector<JudgedLine> judged = JudgeCatalogueLines(catalogue, ProgressListOn);
+    if (ProgressListOn) ListJudgedLines(judged);
+
+    std::vector<std::string> findings;
+    for (const JudgedLine& entry : judged)
+        if (entry.prefix.empty()) findings.push_back(IrregularEntryLine(entry));
+    return WriteFindingsReport({"Irregular_entrys.txt", "Irregular entrys in your static.ini:", "No irregular objects",
+                                "No irregular objects found in your static.ini"},
+                               findings);
 }

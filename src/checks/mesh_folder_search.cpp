@@ -6,9 +6,9 @@
 #include "checks/mesh_folder_search.h"
 
 #include "catalogue/text.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
 
 #include <string_view>
 #include <unordered_map>

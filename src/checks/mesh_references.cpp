@@ -3,11 +3,12 @@
 #include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
 #include "checks/mesh_folder_search.h"
+#include "output/catalogue_loading.h"
 #include "platform/platform.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
-#include "shell/reports.h"
+#include "output/app_state.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
+#include "output/reports.h"
 
 #include <algorithm>
 #include <string_view>
@@ -73,9 +74,7 @@ const std::string SharedRuler(38, '*');
 bool IsSet(const std::string& mesh) { return !mesh.empty(); }
 bool IsMissing(const std::string& mesh, bool found) { return IsSet(mesh) && !found; }
 
-std::string ObjectLine(const MeshIndexEntry& entry) {
-    return "Object (" + std::to_string(entry.number) + ")";
-}
+std::string ObjectLine(const MeshIndexEntry& entry) { return "Object (" + std::to_string(entry.number) + ")"; }
 
 std::string FoundLine(const std::string& key, const std::string& mesh, bool found) {
     return (found ? "Found: " : "Not found: ") + key + " " + mesh;
@@ -92,7 +91,7 @@ void AddLines(std::initializer_list<std::string> lines, const LineSink& add = Ad
 void AddBlockStart(const MeshIndexEntry& entry, const LineSink& add) {
     add(EntryRuler);
     add(ObjectLine(entry));
-    add(entry.sectionName);
+    add(std::string(entry.sectionName));
 }
 
 // Every set mesh with its result.
@@ -147,24 +146,20 @@ bool WriteMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink
 
 }  // namespace
 
-bool CutMeshValue(const std::string& line, std::string& value) {
+bool CutMeshValue(std::string_view line, std::string& value) {
     std::size_t start = LowerCopy(line).find("3do");
     if (start == std::string::npos) return false;
-    value = line.substr(start);
+    value = std::string(line.substr(start));
     std::replace(value.begin(), value.end(), '/', '\\');
     return true;
 }
 
-// The index grows as headers are read: a slot per physical line would hold most of a big catalogue
-// in empty entries.
-bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEntry>& index) {
-    index.clear();
-    CatalogueReader reader;
-    if (!OpenCatalogue(catalogueFolder, reader)) return false;
-    std::string line;
+std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue) {
+    std::vector<MeshIndexEntry> index;
+    LineReader reader = LinesOf(catalogue);
+    std::string_view line, title;
     bool grouped = false;
     while (!grouped && NextCatalogueLine(reader, line)) grouped = line == GroupMarker;
-    std::string title;
     // Only the first group's title line keeps its blanks; every later one is trimmed.
     if (grouped) NextPhysicalLine(reader, title);
     while (grouped && NextCatalogueLine(reader, line)) {
@@ -172,7 +167,7 @@ bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEnt
         // are passed over at their first byte.
         if (line.empty() || (line[0] != '[' && line[0] != 'M')) continue;
         if (line == GroupMarker) {
-            NextCatalogueLine(reader, title);
+            if (!NextCatalogueLine(reader, title)) title = {};
         } else if (IsBuildingHeader(line)) {
             MeshIndexEntry entry;
             entry.title = title;
@@ -189,8 +184,7 @@ bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEnt
             CutMeshValue(line, index.back().meshDead);
         }
     }
-    CloseCatalogue(reader);
-    return true;
+    return index;
 }
 
 // One pass sorts the entries of standard groups by their title, in index order; the titles are then
@@ -206,8 +200,8 @@ void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
         if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "});
         DrainPendingEvents();
         for (MeshIndexEntry* entry : byTitle[t]) {
-            if (ProgressListOn) AddProgressLine("Excluding " + entry->sectionName);
-            entry->title.clear();
+            if (ProgressListOn) AddProgressLine("Excluding " + std::string(entry->sectionName));
+            entry->title = {};
         }
     }
 }
@@ -228,10 +222,10 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
         add(EntryRuler);
         // The list joins the object line and the section name; the report keeps them apart.
         if (list) {
-            add(ObjectLine(entry) + entry.sectionName);
+            add(ObjectLine(entry).append(entry.sectionName));
         } else {
             add(ObjectLine(entry));
-            add(entry.sectionName);
+            add(std::string(entry.sectionName));
         }
         add("MeshLive: " + entry.meshLive);
         add("MeshDead: " + entry.meshDead);
@@ -240,20 +234,22 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
     return reported;
 }
 
-CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode) {
-    const bool missingMode = mode == "missing";
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
+    const bool missingMode = check == MeshCheck::MissingMeshes;
     Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
     Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
         ClearProgressList();
         AddLines({StepRuler, "Building object index"});
     }
-    std::vector<MeshIndexEntry> index;
-    if (!BuildMeshIndex(CatalogueFolder, index)) {
+    std::string catalogue;
+    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
+    if (read != FileRead::Whole) {
         CloseTopWindow(waitWindow);
-        ShowMessage("static.ini failure", "Can't open static.ini");
+        TellCatalogueFailure(read, CantOpenCatalogue);
         return CommandResult::Failed;
     }
+    std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
     ExcludeStandardTitles(index);
     if (ProgressListOn) {
         DrainPendingEvents();

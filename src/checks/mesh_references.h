@@ -1,17 +1,18 @@
-// The mesh reference run behind ".. wrong sim references" (mode "missing": mesh files that no mod's
-// 3do folder holds) and ".. doubled used sims" (mode "doubled": entries whose MeshLive and MeshDead
-// are the same file). Both read the catalogue into one index of entries.
+// The mesh reference run behind ".. wrong sim references" (mesh files that no mod's 3do folder
+// holds) and ".. doubled used sims" (entries whose MeshLive and MeshDead are the same file). Both
+// read the catalogue into one index of entries.
 #pragma once
 
-#include "shell/command_result.h"
+#include "output/command_result.h"
 
 #include <functional>
 #include <string>
+#include <string_view>
 #include <vector>
 
 struct MeshIndexEntry {
-    std::string title;        // the title line of the entry's group; "" once excluded
-    std::string sectionName;  // end cut of the building header
+    std::string_view title;        // the title line of the entry's group; "" once excluded
+    std::string_view sectionName;  // end cut of the building header
     int number = 0;           // ordinal among the headers after the first group marker
     std::string mesh;         // "Mesh " value from its first "3do", "/" turned into "\"; "" when unset
     std::string meshLive;
@@ -33,11 +34,10 @@ extern const std::vector<std::string> StandardTitles;
 
 // The value of a Mesh, MeshLive or MeshDead line: from its first "3do" in any letter case to the end,
 // in the line's own case, with "/" turned into "\". False when the line holds no "3do".
-bool CutMeshValue(const std::string& line, std::string& value);
+bool CutMeshValue(std::string_view line, std::string& value);
 
-// Reads static.ini in the folder into the index, one entry per building header after the first group
-// marker. False when the catalogue cannot be opened.
-bool BuildMeshIndex(const std::string& catalogueFolder, std::vector<MeshIndexEntry>& index);
+// One entry per building header after the first group marker; its views point into the catalogue.
+std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue);
 // Empties the title of every entry in a standard title group; later steps pass over such entries.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index);
 
@@ -49,6 +49,6 @@ bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput ou
 bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
                                 const LineSink& add);
 
-// The whole run for mode "missing" or "doubled" (any other mode runs as "doubled"). Reads
-// CatalogueFolder, which must be known; modsRoot ends in "\". Always writes and opens its report.
-CommandResult CheckMeshReferences(const std::string& modsRoot, const std::string& mode);
+enum class MeshCheck { MissingMeshes, SharedLiveDeadMeshes };
+// The whole run of one of the two checks; modsRoot ends in "\". Always writes and opens its report.
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check);

@@ -2,67 +2,16 @@
 // byte for byte as the desktop program writes them; exit status 0 nothing found (or the catalogue
 // rewritten, or the list written), 1 findings, 2 bad usage or a catalogue or report that could not
 // be read or written.
-#include "checks/doubled_objects.h"
-#include "checks/empty_references.h"
-#include "checks/irregular_entries.h"
-#include "checks/mesh_references.h"
 #include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
-#include "location/derived_paths.h"
+#include "commands/command_table.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 #include "platform/headless/headless.h"
-#include "rewrite/mission_builder_list.h"
-#include "rewrite/renumbering.h"
-#include "shell/app_state.h"
-#include "shell/event_loop.h"
-#include "shell/progress_list.h"
 
 #include <cstdio>
-#include <functional>
 
 namespace {
-
-struct CliCommand {
-    const char* name;
-    const char* summary;
-    std::function<CommandResult(const CliOptions&)> run;
-};
-
-// The rewrite and list commands take the folder, as the menu gives it once one is known.
-CommandResult InCatalogueFolder(CommandResult (*command)(const std::string&, const std::string&),
-                                const std::string& mode) {
-    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
-    return command(CatalogueFolder, mode);
-}
-
-// The mesh reference run takes the mods root of the folder, as the menu gives it.
-CommandResult WithModsRoot(const std::string& mode) {
-    if (!EnsureCatalogueFolderKnown()) return CommandResult::NoFolder;
-    return CheckMeshReferences(DeriveModsRoot(CatalogueFolder), mode);
-}
-
-const CliCommand Commands[] = {
-    {"doubled-objects", "building headers whose section names occur more than once",
-     [](const CliOptions&) { return FindDoubledObjects(); }},
-    {"irregular-entries", "lines that begin with none of the known prefixes",
-     [](const CliOptions&) { return CheckIrregularEntries(); }},
-    {"empty-references", "Mesh, MeshLive and MeshDead lines without a value",
-     [](const CliOptions&) {
-         return EnsureCatalogueFolderKnown() ? FindEmptyReferences(CatalogueFolder) : CommandResult::NoFolder;
-     }},
-    {"renumber", "rewrites static.ini with a number line above every building header",
-     [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "renumber"); }},
-    {"denumber", "rewrites static.ini without its number lines",
-     [](const CliOptions&) { return InCatalogueFolder(RenumberCatalogue, "denumber"); }},
-    {"fmb-list", "object list for the mission builder, without plates (Static_list_FMB.txt)",
-     [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb"); }},
-    {"fmb-plus-list", "object list for FMB+, with plates (Static_list_FMBplus.txt)",
-     [](const CliOptions&) { return InCatalogueFolder(CreateMissionBuilderList, "fmb+"); }},
-    {"missing-objects", "objects a map (--map FILE) places that the catalogue lacks", RunMissingObjectsCommand},
-    {"wrong-sim-references", "mesh files that no 3do folder of a mod holds",
-     [](const CliOptions&) { return WithModsRoot("missing"); }},
-    {"doubled-used-sims", "objects whose MeshLive and MeshDead are the same file",
-     [](const CliOptions&) { return WithModsRoot("doubled"); }},
-};
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
 
@@ -74,7 +23,8 @@ void PrintHelp(std::FILE* to) {
                  "  --progress        print the progress list's lines to standard output\n"
                  "  --map FILE        missing-objects: the map file; without --catalogue, its tree's catalogue\n"
                  "commands:\n");
-    for (const CliCommand& command : Commands) std::fprintf(to, "  %-22s %s\n", command.name, command.summary);
+    for (const Command& command : Commands)
+        if (command.cliName) std::fprintf(to, "  %-22s %s\n", command.cliName, command.summary);
     std::fprintf(to, "exit status: 0 nothing found, catalogue rewritten or list written; 1 findings reported;\n"
                      "  2 bad usage, or a catalogue, report or list that could not be read or written\n");
 }
@@ -100,9 +50,7 @@ int main(int argc, char** argv) {
         PrintHelp(stdout);
         return ExitNothingFound;
     }
-    const CliCommand* chosen = nullptr;
-    for (const CliCommand& command : Commands)
-        if (options.command == command.name) chosen = &command;
+    const Command* chosen = CommandNamed(options.command);
     if (!chosen) {
         std::fprintf(stderr, "verrant-cli: unknown command %s\n", options.command.c_str());
         PrintHelp(stderr);
@@ -125,7 +73,9 @@ int main(int argc, char** argv) {
         OpenProgressList();
     }
 
-    CommandResult result = chosen->run(options);
+    std::string mapSelection;
+    if (chosen->takesMap && !PrepareMapCheck(options, mapSelection)) return ExitTrouble;
+    CommandResult result = RunCommand(*chosen, mapSelection);
     std::fflush(stdout);
     switch (result) {
         case CommandResult::NothingFound: return ExitNothingFound;

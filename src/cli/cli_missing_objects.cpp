@@ -3,24 +3,23 @@
 #include "catalogue/text.h"
 #include "location/catalogue_folder.h"
 #include "location/catalogue_from_map.h"
-#include "maps/missing_map_objects.h"
 #include "maps/missing_objects_window.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 #include <cstdio>
 
-CommandResult RunMissingObjectsCommand(const CliOptions& options) {
+bool PrepareMapCheck(const CliOptions& options, std::string& selection) {
     if (options.map.empty()) {
         std::fprintf(stderr, "verrant-cli: missing-objects needs --map FILE\n");
-        return CommandResult::Failed;
+        return false;
     }
     // The file name stays as the user wrote it: only "static.ini" itself is refused unread.
     std::string path = HeadlessProgramPath(options.map);
     std::size_t slash = path.rfind('\\');
     std::string mapFolder = path.substr(0, slash + 1);
-    std::string selection = mapFolder + "*" + path.substr(slash + 1);
-    if (!ValidateMapFile(0, selection)) return CommandResult::Failed;
+    selection = mapFolder + "*" + path.substr(slash + 1);
+    if (!ValidateMapFile(0, selection)) return false;
 
     if (CatalogueFolder.empty()) {
         CatalogueFolder = DeriveCatalogueFolderFromMap(selection);
@@ -30,12 +29,12 @@ CommandResult RunMissingObjectsCommand(const CliOptions& options) {
         if (!absolute) CatalogueFolder = mapFolder + CatalogueFolder;
         if (!FolderHoldsCatalogue(CatalogueFolder)) {
             std::fprintf(stderr, "static.ini not found: %s\n", HeadlessHostPath(CatalogueFolder).c_str());
-            return CommandResult::Failed;
+            return false;
         }
     } else if (!FolderHoldsCatalogue(CatalogueFolder)) {
         // The desktop program says nothing here, as its folder was found a moment before.
         std::fprintf(stderr, "static.ini failure: Can't open static.ini\n");
-        return CommandResult::Failed;
+        return false;
     }
-    return FindMissingMapObjects(selection, CatalogueFolder);
+    return true;
 }

@@ -2,8 +2,10 @@
 #pragma once
 
 #include "cli/cli_options.h"
-#include "shell/command_result.h"
 
-// Checks the map named by --map against --catalogue, or against the catalogue folder derived from
-// the map's path. Every refusal gives one line on standard error and Failed.
-CommandResult RunMissingObjectsCommand(const CliOptions& options);
+#include <string>
+
+// The selection "folder\*file" of the map named by --map, once it is known to be a map file, with
+// the catalogue folder known: --catalogue, or the one derived from the map's path. Every refusal
+// gives one line on standard error and false.
+bool PrepareMapCheck(const CliOptions& options, std::string& selection);

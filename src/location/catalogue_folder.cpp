@@ -1,9 +1,9 @@
 #include "location/catalogue_folder.h"
 
 #include "platform/platform.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/reports.h"
+#include "output/app_state.h"
+#include "output/messages.h"
+#include "output/system_folders.h"
 
 namespace {
 
@@ -29,8 +29,9 @@ std::string TrackChooserSelection(Handle browser, Handle pathBox) {
 
 }  // namespace
 
-void EnsureCatalogueFolder() {
+bool EnsureCatalogueFolder() {
     if (CatalogueFolder.empty()) CatalogueFolder = ChooseCatalogueFolder();
+    return !CatalogueFolder.empty();
 }
 
 bool FolderHoldsCatalogue(const std::string& folder) {

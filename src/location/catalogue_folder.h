@@ -3,8 +3,9 @@
 
 #include <string>
 
-// When no catalogue folder is known, asks for one with the folder chooser.
-void EnsureCatalogueFolder();
+// When no catalogue folder is known, asks for one with the folder chooser. True when one is known
+// afterwards; otherwise the command ends without a message.
+bool EnsureCatalogueFolder();
 // The folder chooser "Searching static.ini": a folder holding static.ini, ending in "\", or "" when
 // the user closes it.
 std::string ChooseCatalogueFolder();

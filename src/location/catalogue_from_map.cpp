@@ -2,8 +2,8 @@
 
 #include "catalogue/text.h"
 #include "location/catalogue_folder.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
+#include "output/app_state.h"
+#include "output/messages.h"
 
 std::string DeriveCatalogueFolderFromMap(const std::string& mapSelection) {
     std::size_t found = LowerCopy(mapSelection).find("mod");

@@ -4,8 +4,8 @@
 #include "location/catalogue_folder.h"
 #include "location/derived_paths.h"
 #include "platform/platform.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
+#include "output/app_state.h"
+#include "output/messages.h"
 
 namespace {
 
@@ -35,11 +35,11 @@ bool WriteSettingsFile(const std::string& folder, const std::string& startFolder
 }  // namespace
 
 bool LoadSettings(const std::string& startFolder) {
-    CatalogueReader reader;
-    if (!OpenCatalogue(startFolder, reader, SettingsFileName)) return true;
-    std::string folder;
+    std::string settings;
+    if (ReadWholeFile(startFolder, SettingsFileName, settings) == FileRead::NotOpened) return true;
+    LineReader reader = LinesOf(settings);
+    std::string_view folder;
     NextPhysicalLine(reader, folder);
-    CloseCatalogue(reader);
     CatalogueFolder = folder;
     MapsPattern = DeriveMapsPattern(CatalogueFolder);
 

@@ -1,11 +1,12 @@
 #include "maps/missing_map_objects.h"
 
 #include "catalogue/catalogue_reader.h"
+#include "output/catalogue_loading.h"
 #include "maps/map_file.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
-#include "shell/reports.h"
+#include "output/app_state.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
+#include "output/reports.h"
 
 #include <string_view>
 #include <unordered_map>
@@ -13,7 +14,7 @@
 // One index of first ordinals gives the numbers of a walk from the first header, without
 // walking the headers once per name.
 std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames,
-                                      const std::vector<std::string>& sectionNames) {
+                                      const std::vector<std::string_view>& sectionNames) {
     std::unordered_map<std::string_view, int> firstOrdinal;
     firstOrdinal.reserve(sectionNames.size());
     for (std::size_t i = 0; i < sectionNames.size(); ++i)
@@ -27,25 +28,15 @@ std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames,
     return ordinals;
 }
 
-bool ReadSectionNames(const std::string& catalogueFolder, std::vector<std::string>& sectionNames) {
-    sectionNames.clear();
-    CatalogueReader reader;
-    if (!OpenCatalogue(catalogueFolder, reader)) return false;
-    std::string line;
-    while (NextCatalogueLine(reader, line))
-        if (IsBuildingHeader(line)) sectionNames.push_back(SectionNameByBracket(line));
-    CloseCatalogue(reader);
-    return true;
-}
-
 CommandResult FindMissingMapObjects(const std::string& selection, const std::string& catalogueFolder) {
     std::string folder, fileName;
     SplitMapFileSelection(selection, folder, fileName);
     std::vector<std::string> mapNames = ExtractMapObjectNames(ReadMapFileText(folder, fileName));
     DrainPendingEvents();
 
-    std::vector<std::string> sectionNames;
-    if (!ReadSectionNames(catalogueFolder, sectionNames)) return CommandResult::Failed;
+    std::string catalogue;
+    if (!LoadCatalogue(catalogueFolder, catalogue, {})) return CommandResult::Failed;
+    std::vector<std::string_view> sectionNames = BuildingSectionNames(catalogue);
     DrainPendingEvents();
     if (ProgressListOn) ClearProgressList();
 
@@ -67,9 +58,7 @@ CommandResult FindMissingMapObjects(const std::string& selection, const std::str
         AddProgressLine("Total number of objects: " + std::to_string(mapNames.size()));
     }
 
-    if (missing.empty()) {
-        ShowMessage("No missing objects found", "All maps objects found in your static.ini");
-        return CommandResult::NothingFound;
-    }
-    return WriteFindingsReport("Missing_objects.txt", "Missing objects in your static.ini:", missing);
+    return WriteFindingsReport({"Missing_objects.txt", "Missing objects in your static.ini:", "No missing objects found",
+                                "All maps objects found in your static.ini"},
+                               missing);
 }

@@ -3,8 +3,8 @@
 #include "location/catalogue_from_map.h"
 #include "maps/map_file.h"
 #include "maps/missing_map_objects.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
+#include "output/app_state.h"
+#include "output/messages.h"
 
 namespace {
 

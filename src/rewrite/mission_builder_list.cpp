@@ -11,36 +11,36 @@
 
 #include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
-#include "shell/messages.h"
-#include "shell/reports.h"
+#include "output/catalogue_loading.h"
+#include "output/reports.h"
 
 #include <vector>
 
 namespace {
 
 struct BuilderListEntry {
-    std::string groupTitle;  // the untrimmed line after the latest "[***]"; "" before the first
+    std::string_view groupTitle;  // the untrimmed line after the latest "[***]"; "" before the first
     int number = 0;
-    bool isPlate = false;  // mode "fmb" only
-    std::string objectName;
+    bool isPlate = false;  // the list without plates only
+    std::string_view objectName;
 };
 
 const std::string HeadingRuler = "//" + std::string(41, '=');
 
-std::vector<BuilderListEntry> ReadBuilderEntries(CatalogueReader& catalogue, bool leaveOutPlates) {
+std::vector<BuilderListEntry> ReadBuilderEntries(const std::string& catalogue, bool leaveOutPlates) {
     std::vector<BuilderListEntry> entries;
-    std::string groupTitle;
+    std::string_view groupTitle, line;
     int counter = -1;
-    std::string line;
-    while (NextCatalogueLine(catalogue, line)) {
+    LineReader reader = LinesOf(catalogue);
+    while (NextCatalogueLine(reader, line)) {
         // Only a line with a "$" can hold "$kust" or "$suribachi", and only a header is tested for
         // "plate": the other lines, most of a big catalogue, need no lowered copy.
-        bool dollar = line.find('$') != std::string::npos;
+        bool dollar = line.find('$') != std::string_view::npos;
         std::string lower = dollar || IsBuildingHeader(line) ? LowerCopy(line) : std::string();
         if (dollar && (Contains(lower, "$kust") || Contains(lower, "$suribachi"))) continue;
         if (line == "[***]") {
             // The title line is taken whole and not judged, even when it is a header itself.
-            NextPhysicalLine(catalogue, groupTitle);
+            if (!NextPhysicalLine(reader, groupTitle)) groupTitle = {};
         } else if (IsBuildingHeader(line)) {
             BuilderListEntry entry;
             entry.groupTitle = groupTitle;
@@ -61,7 +61,7 @@ void WriteBuilderList(ReportFile& list, const std::string& firstLine,
                       const std::vector<BuilderListEntry>& entries) {
     WriteReportLine(list, firstLine);
     WriteReportLine(list, "");
-    std::string lastTitle;
+    std::string_view lastTitle;
     for (const BuilderListEntry& entry : entries) {
         if (entry.isPlate) continue;
         if (entry.groupTitle != lastTitle) {
@@ -71,22 +71,18 @@ void WriteBuilderList(ReportFile& list, const std::string& firstLine,
             WriteReportLine(list, HeadingRuler);
             lastTitle = entry.groupTitle;
         }
-        WriteReportLine(list, NumberInParentheses(entry.number) + " " + entry.objectName);
+        WriteReportLine(list, NumberInParentheses(entry.number).append(" ").append(entry.objectName));
     }
 }
 
 }  // namespace
 
-CommandResult CreateMissionBuilderList(const std::string& catalogueFolder, const std::string& mode) {
-    bool plus = mode == "fmb+";
-    CatalogueReader catalogue;
-    if (!OpenCatalogue(catalogueFolder, catalogue, "Static.ini")) {
-        ShowMessage("static.ini failure:", "Can't read the static,ini");
+CommandResult CreateMissionBuilderList(const std::string& catalogueFolder, BuilderList variant) {
+    const bool plus = variant == BuilderList::FmbPlus;
+    std::string catalogue;
+    if (!LoadCatalogue(catalogueFolder, catalogue, {"static.ini failure:", "Can't read the static,ini"}))
         return CommandResult::Failed;
-    }
     std::vector<BuilderListEntry> entries = ReadBuilderEntries(catalogue, !plus);
-    CloseCatalogue(catalogue);
-
     ReportFile list;
     if (!CreateReport(plus ? "Static_list_FMBplus.txt" : "Static_list_FMB.txt", list))
         return CommandResult::Failed;

@@ -1,7 +1,7 @@
 #include "shell/main_window.h"
 
 #include "platform/platform.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 #include <utility>
 #include <vector>

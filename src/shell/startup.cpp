@@ -4,11 +4,11 @@
 #include "location/derived_paths.h"
 #include "location/settings.h"
 #include "platform/platform.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 #include "shell/event_loop.h"
 #include "shell/main_window.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
 
 namespace {
 

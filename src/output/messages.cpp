@@ -1,4 +1,4 @@
-#include "shell/messages.h"
+#include "output/messages.h"
 
 #include "platform/platform.h"
 

@@ -1,7 +1,7 @@
-#include "shell/progress_list.h"
+#include "output/progress_list.h"
 
 #include "platform/platform.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 void OpenProgressList() {
     ProgressWindow = OpenTopWindow("List searching window", 650, 320, 370, 470, FrameStyle{});

@@ -1,4 +1,4 @@
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 std::string StartFolder;
 std::string CatalogueFolder;

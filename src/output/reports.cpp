@@ -1,6 +1,7 @@
-#include "shell/reports.h"
+#include "output/reports.h"
 
-#include "shell/messages.h"
+#include "output/messages.h"
+#include "output/system_folders.h"
 
 namespace {
 
@@ -9,22 +10,6 @@ const std::size_t ReportBlockSize = 1 << 16;
 void TellReportFailure(const std::string& fileName) { ShowMessage("Report failure", "Can't write " + fileName); }
 
 }  // namespace
-
-std::string GetSpecialFolderPath(int folderId) {
-    if (folderId != 0) return "";
-    std::string path = DesktopFolderPath();
-    if (!path.empty() && path.back() != '\\') path += '\\';
-    return path;
-}
-
-std::string GetEnvironmentValue(const std::string& name) { return EnvironmentValue(name); }
-
-std::string WindowsFolder() {
-    std::string folder = GetEnvironmentValue("WINDIR");
-    return folder.empty() ? SystemWindowsFolder() : folder;
-}
-
-std::string GetReportFolder() { return GetSpecialFolderPath(0); }
 
 bool CreateReport(const std::string& fileName, ReportFile& report) {
     report = ReportFile();
@@ -43,12 +28,12 @@ bool CreateReport(const std::string& fileName, ReportFile& report) {
     return true;
 }
 
-void WriteReportLine(ReportFile& report, const std::string& line) {
+void WriteReportLine(ReportFile& report, std::string_view line) {
     WriteReportText(report, line);
     report.pending += "\r\n";
 }
 
-void WriteReportText(ReportFile& report, const std::string& text) {
+void WriteReportText(ReportFile& report, std::string_view text) {
     if (report.file == 0) return;
     report.pending += text;
     if (report.pending.size() >= ReportBlockSize) WritePendingText(report);
@@ -74,11 +59,14 @@ bool FinishReport(ReportFile& report) {
     return true;
 }
 
-CommandResult WriteFindingsReport(const std::string& fileName, const std::string& heading,
-                                  const std::vector<std::string>& findings) {
+CommandResult WriteFindingsReport(const FindingsReport& shape, const std::vector<std::string>& findings) {
+    if (findings.empty()) {
+        ShowMessage(shape.noneTitle, shape.noneText);
+        return CommandResult::NothingFound;
+    }
     ReportFile report;
-    if (!CreateReport(fileName, report)) return CommandResult::Failed;
-    WriteReportLine(report, heading);
+    if (!CreateReport(shape.fileName, report)) return CommandResult::Failed;
+    WriteReportLine(report, shape.heading);
     WriteReportLine(report, "");
     for (const std::string& finding : findings) WriteReportLine(report, finding);
     return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;

@@ -1,0 +1,17 @@
+#include "output/catalogue_loading.h"
+
+#include "output/messages.h"
+
+void TellCatalogueFailure(FileRead read, const CatalogueOpenFailure& notOpened) {
+    if (read == FileRead::FailedPartway)
+        ShowMessage("static.ini failure", "Can't read static.ini");
+    else if (read == FileRead::NotOpened && !notOpened.title.empty())
+        ShowMessage(notOpened.title, notOpened.text);
+}
+
+bool LoadCatalogue(const std::string& folder, std::string& catalogue, const CatalogueOpenFailure& notOpened) {
+    FileRead read = ReadWholeFile(folder, "static.ini", catalogue);
+    if (read == FileRead::Whole) return true;
+    TellCatalogueFailure(read, notOpened);
+    return false;
+}
