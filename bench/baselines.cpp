@@ -36,7 +36,7 @@ bool ReadPhysicalLine(std::FILE* file, std::string& line) {
 
 bool ReadCatalogueLine(std::FILE* file, std::string& line) {
     if (!ReadPhysicalLine(file, line)) return false;
-    TrimBlanksInPlace(line);
+    line = std::string(TrimBlanks(line));
     return true;
 }
 
@@ -98,7 +98,7 @@ std::vector<std::string> SectionNamesByBracket(std::FILE* file) {
     std::vector<std::string> names;
     std::string line;
     while (ReadCatalogueLine(file, line))
-        if (Begins(line, "[bui")) names.push_back(SectionNameByBracket(line));
+        if (Begins(line, "[bui")) names.push_back(std::string(SectionNameByBracket(line)));
     return names;
 }
 
@@ -426,7 +426,7 @@ bool BuilderList(const BaselineInput& input, bool plus) {
         if (line == "[***]") {
             if (!ReadPhysicalLine(file, title)) title.clear();
         } else if (Begins(line, "[bui")) {
-            entries.push_back({title, ++counter, false, ObjectNameOf(line)});
+            entries.push_back({title, ++counter, false, std::string(ObjectNameOf(line))});
             if (!plus && lower.find("plate") != std::string::npos) {
                 entries.back().isPlate = true;
                 --counter;

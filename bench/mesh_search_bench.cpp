@@ -9,7 +9,7 @@
 #include "checks/mesh_folder_search.h"
 #include "plain_mesh_search.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 #include <chrono>
 #include <cstdio>

@@ -3,10 +3,11 @@
 //
 //   bench-missing-objects FOLDER    builds FOLDER/mods/... and leaves it there for verrant-cli
 #include "map_records.h"
+#include "catalogue/catalogue_reader.h"
 #include "maps/map_file.h"
 #include "maps/missing_map_objects.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 #include <algorithm>
 #include <chrono>
@@ -56,7 +57,7 @@ std::string Catalogue() {
 }
 
 std::vector<int> WalkedOrdinals(const std::vector<std::string>& names,
-                                const std::vector<std::string>& sections) {
+                                const std::vector<std::string_view>& sections) {
     std::vector<int> ordinals;
     for (const std::string& name : names) {
         int found = NotInCatalogue;
@@ -95,8 +96,9 @@ int main(int argc, char** argv) {
     double wholeCheck = BestTime([&] { FindMissingMapObjects(mapFolder + "*" + mapName, catalogueFolder); });
 
     std::vector<std::string> names = ExtractMapObjectNames(ReadMapFileText(mapFolder, mapName));
-    std::vector<std::string> sections;
-    ReadSectionNames(catalogueFolder, sections);
+    std::string catalogueBytes;
+    ReadWholeFile(catalogueFolder, "static.ini", catalogueBytes);
+    std::vector<std::string_view> sections = BuildingSectionNames(catalogueBytes);
     std::vector<int> indexed, walked;
     double indexedLookup = BestTime([&] { indexed = FirstSectionOrdinals(names, sections); });
     double walkedLookup = BestTime([&] { walked = WalkedOrdinals(names, sections); });

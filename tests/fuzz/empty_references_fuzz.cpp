@@ -2,7 +2,7 @@
 #include "fuzz_support.h"
 
 #include "checks/empty_references.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 
 #include <string_view>
 

@@ -3,8 +3,8 @@
 #include "baselines.h"
 #include "catalogue/catalogue_reader.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 
 #include <cstdio>
 #include <cstdlib>

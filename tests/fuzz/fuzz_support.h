@@ -2,7 +2,7 @@
 // headless platform set up afresh for each input.
 #pragma once
 
-#include "shell/command_result.h"
+#include "output/command_result.h"
 
 #include <cstddef>
 #include <cstdint>

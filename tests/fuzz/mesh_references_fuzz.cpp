@@ -4,8 +4,8 @@
 #include "fuzz_support.h"
 
 #include "checks/mesh_references.h"
-#include "shell/app_state.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 
 #include <sstream>
 

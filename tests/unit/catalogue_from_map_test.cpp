@@ -1,7 +1,7 @@
 #include "location/catalogue_from_map.h"
 
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 #include "test_support.h"
 
 TEST(CatalogueFromMap, DerivesTheFolderBeforeTheFirstMod) {

@@ -1,7 +1,7 @@
 #include "shell/main_window.h"
 
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 #include "test_support.h"
 
 namespace {

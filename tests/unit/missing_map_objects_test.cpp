@@ -2,8 +2,8 @@
 
 #include "map_records.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 #include "test_support.h"
 
 TEST(MissingMapObjects, FirstOrdinalOfEachName) {

@@ -2,7 +2,7 @@
 
 #include "map_records.h"
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
+#include "output/app_state.h"
 #include "test_support.h"
 
 namespace {

@@ -2,9 +2,9 @@
 
 #include "catalogue/text.h"
 #include "checks/mesh_folder_search.h"
-#include "shell/app_state.h"
-#include "shell/messages.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/messages.h"
+#include "output/progress_list.h"
 
 void SearchModMeshFoldersPlainly(std::vector<MeshIndexEntry>& index, const std::string& modsRoot,
                                  Handle bar) {

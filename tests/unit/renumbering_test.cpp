@@ -1,8 +1,8 @@
 #include "rewrite/renumbering.h"
 
 #include "platform/headless/headless.h"
-#include "shell/app_state.h"
-#include "shell/progress_list.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 #include "test_support.h"
 
 namespace {
