@@ -42,6 +42,8 @@ FileRead ReadWholeFile(const std::string& folder, const std::string& fileName, s
     if (!MakeFolderCurrent(folder)) return FileRead::NotOpened;
     Handle file = OpenForReading(fileName);
     if (file == 0) return FileRead::NotOpened;
+    // One block for the whole file: growing it as it fills would copy it over and over.
+    bytes.reserve(FileSizeOf(file) + blockSize);
     for (;;) {
         std::size_t filled = bytes.size();
         bytes.resize(filled + blockSize);

@@ -110,6 +110,8 @@ std::string CurrentFolder();  // as the system gives it, without a trailing "\" 
 Handle OpenForReading(const std::string& name);
 // Creates or empties the file for writing.
 Handle CreateForWriting(const std::string& name);
+// The file's size when it was opened, so that it can be read whole into one block; 0 when unknown.
+std::size_t FileSizeOf(Handle file);
 // Bytes read into buffer; 0 at the end of the file or on a failure.
 std::size_t ReadBytes(Handle file, char* buffer, std::size_t size);
 // Whether a read of this file failed: tells a failure from the end of the file.

@@ -3,6 +3,8 @@
 // takes the entry whose name is the same without regard to ASCII letter case.
 #include "platform/headless/headless.h"
 
+#include <sys/stat.h>
+
 #include <algorithm>
 #include <cstdio>
 #include <filesystem>
@@ -208,6 +210,13 @@ Handle CreateForWriting(const std::string& name) {
     if (IsFolder(host)) return 0;
     std::FILE* stream = std::fopen(host.c_str(), "wb");
     return stream ? Remember(stream, name) : 0;
+}
+
+std::size_t FileSizeOf(Handle handle) {
+    OpenFile* file = FindFile(handle);
+    struct stat status {};
+    if (!file || fstat(fileno(file->stream), &status) != 0) return 0;
+    return static_cast<std::size_t>(status.st_size);
 }
 
 std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
