@@ -40,6 +40,9 @@ add_counts() {
 logs="$top/build/logs"
 mkdir -p "$logs"
 
+# Includes in src/ point down only.
+if bash tools/check-layers.sh >"$logs/layers.log" 2>&1; then pass "layers"; else fail "layers"; cat "$logs/layers.log"; fi
+
 # Native: core, headless platform, verrant-cli and unit tests under the sanitizers.
 if cmake -S . -B build/native -DCMAKE_BUILD_TYPE=Debug -DVERRANT_SANITIZE=ON -DVERRANT_WERROR=ON \
         >"$logs/native-configure.log" 2>&1 &&
