@@ -39,13 +39,6 @@ std::vector<int> BarMovesAfter(long long visits) {
 
 }  // namespace
 
-TEST(MeshFolderSearch, ShownModsRootStartsAtItsFirstMods) {
-    EXPECT_EQ(ShownModsRoot("C:\\Game\\mods\\"), "...\\mods\\");
-    EXPECT_EQ(ShownModsRoot("D:\\Sim\\Mods\\"), "...\\Mods\\");
-    EXPECT_EQ(ShownModsRoot("D:\\MODS_old\\Sim\\mods\\"), "...\\MODS_old\\Sim\\mods\\");
-    EXPECT_EQ(ShownModsRoot("ods\\"), "...\\ods\\");
-}
-
 TEST(MeshFolderSearch, BarMovesAtItsVisitCounts) {
     HeadlessReset();
     Handle window = OpenTopWindow("Wait", 0, 0, 10, 10, FrameStyle{});
@@ -93,15 +86,6 @@ TEST_F(MeshFolderSearchTest, FolderIsNoMeshFile) {
     Mesh("mods/ModA/3do/Buildings/a.sim");
     SearchModMeshFolders(index, ModsRoot(), NewBar());
     EXPECT_EQ(Flags(index), "001 010 100 ");
-}
-
-TEST_F(MeshFolderSearchTest, UnlistableModsRootFindsNothing) {
-    std::vector<MeshIndexEntry> index = {Entry("T", "3do\\a.sim")};
-    ProgressListOn = true;
-    OpenProgressList();
-    SearchModMeshFolders(index, Folder("Game/none"), NewBar());
-    EXPECT_EQ(Flags(index), "000 ");
-    EXPECT_EQ(ProgressLines(), Strings{});
 }
 
 // Random trees with folders in other letter cases, decoys and odd path names: the search must give
