@@ -32,7 +32,8 @@ Files FilesBelow(const fs::path& folder, const std::string& prefix = "") {
     if (fs::is_directory(folder))
         for (const fs::directory_entry& entry : fs::recursive_directory_iterator(folder))
             if (entry.is_regular_file())
-                files[prefix + entry.path().lexically_relative(folder).generic_string()] = ReadFile(entry.path());
+                files[prefix + entry.path().lexically_relative(folder).generic_string()] =
+                    ReadFile(entry.path());
     return files;
 }
 
@@ -42,17 +43,19 @@ Files RunCase(const fs::path& caseFolder, const fs::path& scratch) {
     fs::remove_all(scratch);
     fs::create_directories(scratch / "tree");
     fs::create_directories(scratch / "reports");
-    if (fs::exists(caseFolder / "tree")) fs::copy(caseFolder / "tree", scratch / "tree", fs::copy_options::recursive);
+    if (fs::exists(caseFolder / "tree"))
+        fs::copy(caseFolder / "tree", scratch / "tree", fs::copy_options::recursive);
     const std::string root = fs::canonical(scratch).string();
     std::string words = ReadFile(caseFolder / "command");
     words = words.substr(0, words.find_first_of("\r\n"));
     // The case's words come last, so that a --report-dir of its own wins.
-    std::string line = "cd '" + root + "' && '" VERRANT_CLI_PATH "' --report-dir '" + root + "/reports' " + words +
-                       " >stdout 2>stderr; echo $? >status";
+    std::string line = "cd '" + root + "' && '" VERRANT_CLI_PATH "' --report-dir '" + root + "/reports' " +
+                       words + " >stdout 2>stderr; echo $? >status";
     std::system(line.c_str());
     Files files = FilesBelow(root);
     for (auto& [name, bytes] : files)
-        for (std::size_t at; (at = bytes.find(root)) != std::string::npos;) bytes.replace(at, root.size(), "<root>");
+        for (std::size_t at; (at = bytes.find(root)) != std::string::npos;)
+            bytes.replace(at, root.size(), "<root>");
     return files;
 }
 
