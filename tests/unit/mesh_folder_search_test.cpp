@@ -79,15 +79,6 @@ TEST_F(MeshFolderSearchTest, BarCountsEveryEntryOncePerSearchedFolder) {
     EXPECT_EQ(Flags({index[7]}), "100 ");
 }
 
-TEST_F(MeshFolderSearchTest, FolderIsNoMeshFile) {
-    std::vector<MeshIndexEntry> index = {Entry("T", "3do", "3do\\Buildings\\", "3do\\Buildings\\a.sim"),
-                                         Entry("T", "3do\\Buildings\\a.sim\\", "3do\\Buildings\\.\\a.sim"),
-                                         Entry("T", "3do\\Buildings\\..\\Buildings\\a.sim")};
-    Mesh("mods/ModA/3do/Buildings/a.sim");
-    SearchModMeshFolders(index, ModsRoot(), NewBar());
-    EXPECT_EQ(Flags(index), "001 010 100 ");
-}
-
 // Random trees with folders in other letter cases, decoys and odd path names: the search must give
 // the plain search's flags, lines and bar moves, with fewer opens.
 TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {

@@ -96,17 +96,3 @@ TEST_F(MissingObjectsWindowTest, FilesThatAreNoMapsAreRefused) {
     }
 }
 
-TEST_F(MissingObjectsWindowTest, EventsOfOtherWindowsAreDroppedAndTheCloseBoxReturns) {
-    OpenTopWindow("Verrant V.1.3", 0, 0, 100, 100, FrameStyle{});
-    HeadlessScript(BrowserStep(Title, Fields(), "actors.static", true));
-    HeadlessScript(ControlStep("Verrant V.1.3", OkId));
-    HeadlessScript(MenuStep("Verrant V.1.3", 2));
-    HeadlessScript(CloseStep("Verrant V.1.3"));
-    HeadlessScript(CloseStep(Title));
-    ShowMissingObjectsWindow("");
-    EXPECT_TRUE(HeadlessProcesses().empty());
-    EXPECT_EQ(Messages(), Strings{});
-    EXPECT_NE(HeadlessFindWindow("Verrant V.1.3"), 0u);
-    EXPECT_EQ(HeadlessFindWindow(Title), 0u);
-    EXPECT_EQ(HeadlessWaitsRunDry(), 0);
-}

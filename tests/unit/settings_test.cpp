@@ -142,25 +142,3 @@ TEST_F(SettingsTest, ClearTwiceDeletesThenHasNothingToClear) {
               Strings({"Path cleared: verrant.ini deleted", "Path cleared failure: Nothing to clear"}));
 }
 
-TEST_F(SettingsTest, NothingClearedKeepsTheKnownFolder) {
-    struct Case {
-        std::string name;
-        bool fileSaved, removeFails;
-    };
-    const std::vector<Case> cases = {{"nothing saved", false, false}, {"delete fails", true, true}};
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.name);
-        HeadlessReset();
-        if (c.fileSaved) Write("start/verrant.ini", catalogue);
-        HeadlessFileFaults faults;
-        faults.failRemove = c.removeFails;
-        HeadlessSetFileFaults(faults);
-        CatalogueFolder = catalogue;
-        MapsPattern = CatalogueMapsPattern();
-        ClearPath();
-        EXPECT_EQ(Messages(), Strings({"Path cleared failure: Nothing to clear"}));
-        EXPECT_EQ(CatalogueFolder, catalogue);
-        EXPECT_EQ(MapsPattern, CatalogueMapsPattern());
-        EXPECT_EQ(Exists("start/verrant.ini"), c.fileSaved);
-    }
-}

@@ -35,18 +35,6 @@ class StartupTest : public ScratchTest {
 
 }  // namespace
 
-TEST_F(StartupTest, SettingsFileNamesTheFolder) {
-    Write("start/verrant.ini", catalogue);
-    CatalogueFolder = "left over from before";
-    EXPECT_EQ(RunVerrant(), 0);
-    EXPECT_EQ(StartFolder, Folder("start"));
-    EXPECT_EQ(CatalogueFolder, catalogue);
-    EXPECT_EQ(MapsPattern, Folder("Sim") + "Mods\\mapmods\\maps\\*.*");
-    EXPECT_EQ(Messages(), Strings{});
-    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main}));
-    EXPECT_FALSE(AnyWindowOpen());
-}
-
 TEST_F(StartupTest, FirstStartSavesTheChosenFolder) {
     ScriptChoosingTheCatalogue();
     EXPECT_EQ(RunVerrant(), 0);
