@@ -1,25 +1,22 @@
 #include "checks/doubled_objects.h"
 
+#include "catalogue/name_table.h"
 #include "output/app_state.h"
 #include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
 
-#include <unordered_map>
 
 // One pass from the end finds each name's next occurrence, so the pairs come out in the order of
 // the pairwise walk without its square cost.
 std::vector<DoubledObject> PairDoubledNames(const std::vector<std::string_view>& names) {
     std::vector<int> next(names.size(), -1);
-    std::unordered_map<std::string_view, int> laterOccurrence;
-    laterOccurrence.reserve(names.size());
+    NameTable laterOccurrence = NameTableFor(names.size());
     for (int i = static_cast<int>(names.size()) - 1; i >= 0; --i) {
-        auto [it, inserted] = laterOccurrence.try_emplace(names[i], i);
-        if (!inserted) {
-            next[i] = it->second;
-            it->second = i;
-        }
+        int& slot = NameSlot(laterOccurrence, names, names[i]);
+        next[i] = slot;
+        slot = i;
     }
     std::vector<DoubledObject> doubles;
     for (int i = 0; i < static_cast<int>(names.size()); ++i)

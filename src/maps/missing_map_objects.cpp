@@ -1,6 +1,7 @@
 #include "maps/missing_map_objects.h"
 
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/name_table.h"
 #include "output/catalogue_loading.h"
 #include "maps/map_file.h"
 #include "output/app_state.h"
@@ -8,22 +9,21 @@
 #include "output/progress_list.h"
 #include "output/reports.h"
 
-#include <string_view>
-#include <unordered_map>
 
 // One index of first ordinals gives the numbers of a walk from the first header, without
 // walking the headers once per name.
 std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames,
                                       const std::vector<std::string_view>& sectionNames) {
-    std::unordered_map<std::string_view, int> firstOrdinal;
-    firstOrdinal.reserve(sectionNames.size());
-    for (std::size_t i = 0; i < sectionNames.size(); ++i)
-        firstOrdinal.try_emplace(sectionNames[i], static_cast<int>(i));
+    NameTable firstOrdinal = NameTableFor(sectionNames.size());
+    for (std::size_t i = 0; i < sectionNames.size(); ++i) {
+        int& slot = NameSlot(firstOrdinal, sectionNames, sectionNames[i]);
+        if (slot < 0) slot = static_cast<int>(i);
+    }
     std::vector<int> ordinals;
     ordinals.reserve(mapNames.size());
     for (const std::string& name : mapNames) {
-        auto found = firstOrdinal.find(name);
-        ordinals.push_back(found == firstOrdinal.end() ? NotInCatalogue : found->second);
+        int slot = NameSlot(firstOrdinal, sectionNames, name);
+        ordinals.push_back(slot < 0 ? NotInCatalogue : slot);
     }
     return ordinals;
 }
