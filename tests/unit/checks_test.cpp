@@ -11,6 +11,7 @@
 namespace {
 
 const std::string Stars14(14, '*'), Stars38(38, '*');
+const MeshOutput List = MeshOutput::ProgressList, Body = MeshOutput::ReportBody;
 
 std::string Joined(std::initializer_list<std::string_view> parts) {
     std::string text;
@@ -30,10 +31,10 @@ Strings MeshIndexOf(const std::string& catalogue, bool exclude = false) {
 }
 
 using MeshReport = bool (*)(const std::vector<MeshIndexEntry>&, MeshOutput, const LineSink&);
-Strings Collected(MeshReport report, const std::vector<MeshIndexEntry>& index, MeshOutput output,
-                  bool reported) {
+// The lines one output of a mesh check gives; its reported flag must be the one expected.
+Strings Emitted(MeshReport report, const std::vector<MeshIndexEntry>& index, MeshOutput out, bool reported) {
     Strings lines;
-    EXPECT_EQ(report(index, output, [&](const std::string& line) { lines.push_back(line); }), reported);
+    EXPECT_EQ(report(index, out, [&](const std::string& line) { lines.push_back(line); }), reported);
     return lines;
 }
 
@@ -155,20 +156,20 @@ TEST(Checks, MissingMeshesInTheListAndInTheReport) {
     index[1] = {"T", "Both", 1, "3do\\m.sim", "3do\\l.sim", "", true, false, false};
     index[2] = {"T", "LiveFound", 2, "", "3do\\l.sim", "3do\\d.sim", false, true, false};
     index[3] = {"T", "DeadOnly", 3, "", "", "3do\\d.sim", false, false, false};
-    EXPECT_EQ(Collected(ReportMissingMeshes, index, MeshOutput::ProgressList, true),
+    EXPECT_EQ(Emitted(ReportMissingMeshes, index, List, true),
               Strings({" ", "//**************************", "Starting output", " ", Stars14, "Object (1)",
                        "Both", "Found: Mesh 3do\\m.sim", Stars14, "Object (1)", "Both",
                        "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)", "LiveFound",
                        "Found: MeshLive 3do\\l.sim", "Not Found: MeshDead 3do\\d.sim", Stars14, "Object (3)",
                        "DeadOnly", "Not Found: MeshDead 3do\\d.sim"}));
-    EXPECT_EQ(Collected(ReportMissingMeshes, index, MeshOutput::ReportBody, true),
+    EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, true),
               Strings({Stars14, "Object (1)", "Both", "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)",
                        "LiveFound", "Not found: MeshDead 3do\\d.sim", Stars14, "Object (3)", "DeadOnly",
                        "Not found: MeshDead 3do\\d.sim"}));
     index.resize(2);
     index[1].meshLiveFound = true;
-    EXPECT_EQ(Collected(ReportMissingMeshes, index, MeshOutput::ReportBody, false),
-              Strings({"No wrong references found"}));
+    EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, false), Strings({"No wrong references found"}));
+    EXPECT_EQ(Emitted(ReportMissingMeshes, index, List, false).back(), "No missing Meshs found");
 }
 
 TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
@@ -189,11 +190,10 @@ TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
     report.insert(report.end(), {Stars14, "Object (1)", "buildings.House$Slashes", "MeshLive: 3do\\A\\l.sim",
                                  "MeshDead: 3do\\A\\l.sim", Stars14, "Object (3)", "bui$Prefix",
                                  "MeshLive: 3do\\a.sim", "MeshDead: 3do\\a.sim"});
-    EXPECT_EQ(Collected(ReportSharedLiveDeadMeshes, index, MeshOutput::ProgressList, true), list);
-    EXPECT_EQ(Collected(ReportSharedLiveDeadMeshes, index, MeshOutput::ReportBody, true), report);
+    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, List, true), list);
+    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, Body, true), report);
     index.resize(1);
-    EXPECT_EQ(Collected(ReportSharedLiveDeadMeshes, index, MeshOutput::ReportBody, false).back(),
-              "No doubled used Meshs found");
+    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, Body, false).back(), "No doubled used Meshs found");
 }
 
 TEST(Checks, NumberLines) {
