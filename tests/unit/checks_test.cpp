@@ -151,21 +151,24 @@ TEST(Checks, StandardTitlesAreExcludedWholeAndCaseSensitively) {
 }
 
 TEST(Checks, MissingMeshesInTheListAndInTheReport) {
-    std::vector<MeshIndexEntry> index(4);
+    std::vector<MeshIndexEntry> index(5);
     index[0] = {"", "Std", 0, "3do\\s.sim", "", "", false, false, false};
     index[1] = {"T", "Both", 1, "3do\\m.sim", "3do\\l.sim", "", true, false, false};
     index[2] = {"T", "LiveFound", 2, "", "3do\\l.sim", "3do\\d.sim", false, true, false};
     index[3] = {"T", "DeadOnly", 3, "", "", "3do\\d.sim", false, false, false};
+    index[4] = {"T", "NoneFound", 4, "", "3do\\l.sim", "3do\\d.sim", false, false, false};  // both named
     EXPECT_EQ(Emitted(ReportMissingMeshes, index, List, true),
               Strings({" ", "//**************************", "Starting output", " ", Stars14, "Object (1)",
                        "Both", "Found: Mesh 3do\\m.sim", Stars14, "Object (1)", "Both",
                        "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)", "LiveFound",
                        "Found: MeshLive 3do\\l.sim", "Not Found: MeshDead 3do\\d.sim", Stars14, "Object (3)",
-                       "DeadOnly", "Not Found: MeshDead 3do\\d.sim"}));
+                       "DeadOnly", "Not Found: MeshDead 3do\\d.sim", Stars14, "Object (4)", "NoneFound",
+                       "Not found: MeshLive 3do\\l.sim", "Not Found: MeshDead 3do\\d.sim"}));
     EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, true),
               Strings({Stars14, "Object (1)", "Both", "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)",
                        "LiveFound", "Not found: MeshDead 3do\\d.sim", Stars14, "Object (3)", "DeadOnly",
-                       "Not found: MeshDead 3do\\d.sim"}));
+                       "Not found: MeshDead 3do\\d.sim", Stars14, "Object (4)", "NoneFound",
+                       "Not found: MeshLive 3do\\l.sim", "Not found: MeshDead 3do\\d.sim"}));
     index.resize(2);
     index[1].meshLiveFound = true;
     EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, false), Strings({"No wrong references found"}));

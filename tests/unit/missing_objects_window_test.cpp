@@ -96,3 +96,9 @@ TEST_F(MissingObjectsWindowTest, FilesThatAreNoMapsAreRefused) {
     }
 }
 
+
+TEST(MissingObjectsWindow, ShownPathKeepsAtMost43Characters) {
+    const std::string path43 = "C:\\" + std::string(40, 'a');
+    EXPECT_EQ(ShownMapPath(path43), path43);
+    EXPECT_EQ(ShownMapPath(path43 + "bc"), "..." + std::string(38, 'a') + "bc");
+}
