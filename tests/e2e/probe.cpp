@@ -21,10 +21,8 @@ void DescribeMenu(HMENU menu, const std::string& indent, std::string& out) {
         item.cch = sizeof text;
         GetMenuItemInfoA(menu, static_cast<UINT>(i), TRUE, &item);
         bool command = !item.hSubMenu && !(item.fType & MFT_SEPARATOR);
-        out.append(indent).append(command ? std::to_string(item.wID) + " " : "").append(text);
-        out.append(item.fType & MFT_SEPARATOR ? "-\n"
-                   : command && item.fState   ? " (grayed or checked)\n"
-                                              : "\n");
+        out.append(indent).append(item.fType & MFT_SEPARATOR ? "-" : "");
+        out.append(command ? std::to_string(item.wID) + " " : "").append(text).append("\n");
         if (item.hSubMenu) DescribeMenu(item.hSubMenu, indent + "  ", out);
     }
 }
@@ -43,13 +41,10 @@ std::string Layout(HWND window) {
     AdjustWindowRectEx(&frame, static_cast<DWORD>(style), FALSE,
                        static_cast<DWORD>(GetWindowLongA(window, GWL_EXSTYLE)));
     std::string out = Place(box, {frame.right - frame.left, frame.bottom - frame.top});
-    const std::pair<LONG, const char*> traits[] = {{WS_CAPTION, " caption"},
-                                                   {WS_SYSMENU, " sysmenu"},
-                                                   {WS_THICKFRAME, " sizing"},
-                                                   {WS_MINIMIZEBOX, " minbox"},
-                                                   {WS_MAXIMIZEBOX, " maxbox"}};
-    for (auto [bits, name] : traits)
-        if ((style & bits) == bits) out += name;
+    const LONG bits[] = {WS_CAPTION, WS_SYSMENU, WS_THICKFRAME, WS_MINIMIZEBOX, WS_MAXIMIZEBOX};
+    const char* traits[] = {" caption", " sysmenu", " sizing", " minbox", " maxbox"};
+    for (int i = 0; i < 5; ++i)
+        if ((style & bits[i]) == bits[i]) out += traits[i];
     if (GetClassLongA(window, GCL_STYLE) & CS_NOCLOSE) out += " noclose";
     for (HWND child = GetWindow(window, GW_CHILD); child; child = GetWindow(child, GW_HWNDNEXT)) {
         char name[64] = "", text[256] = "", face[LF_FACESIZE] = "";
@@ -61,6 +56,12 @@ std::string Layout(HWND window) {
         if (GetWindowLongA(child, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) out += " sunken";
         style = GetWindowLongA(child, GWL_STYLE) & (BS_PUSHLIKE | BS_TYPEMASK);
         if (lstrcmpA(name, "Button") == 0 && style == (BS_PUSHLIKE | BS_AUTOCHECKBOX)) out += " toggle";
+        LVCOLUMNA column = {};
+        column.mask = LVCF_TEXT;
+        column.pszText = face;
+        column.cchTextMax = sizeof face;
+        for (WPARAM c = 0; SendMessageA(child, LVM_GETCOLUMNA, c, reinterpret_cast<LPARAM>(&column)); ++c)
+            out.append(c ? "," : " columns ").append(face);
         // A caption must fit between two pixels of border on each side, in a font other than the bold
         // system font.
         auto font = reinterpret_cast<HFONT>(SendMessageA(child, WM_GETFONT, 0, 0));
@@ -79,20 +80,14 @@ std::string Layout(HWND window) {
 std::string Rows(HWND list) {
     std::string out;
     char text[512] = "";
-    LVCOLUMNA column = {};
-    column.mask = LVCF_TEXT;
-    column.pszText = text;
-    column.cchTextMax = sizeof text;
-    for (WPARAM c = 0; SendMessageA(list, LVM_GETCOLUMNA, c, reinterpret_cast<LPARAM>(&column)); ++c)
-        out.append(c ? "\t" : "").append(text);
     LVITEMA cell = {};
     cell.pszText = text;
     cell.cchTextMax = sizeof text;
     for (WPARAM r = 0; r < static_cast<WPARAM>(SendMessageA(list, LVM_GETITEMCOUNT, 0, 0)); ++r) {
         SendMessageA(list, LVM_GETITEMTEXTA, r, reinterpret_cast<LPARAM>(&cell));
-        out.append("\n").append(text);
+        out.append(text).append("\n");
     }
-    return out + "\n";
+    return out;
 }
 
 void UseRow(HWND list, WPARAM row, WPARAM how) {

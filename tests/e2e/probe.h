@@ -11,7 +11,7 @@
 enum ProbeRequest {
     ProbeMenu = 1,        // each item indented by its depth: "ID TEXT", a sub-menu's TEXT, or "-"
     ProbeLayout,          // place, client size and frame; each child: class, text, place, traits, faults
-    ProbeRows,            // the list view's columns on one line, then each row's name
+    ProbeRows,            // the name of each row of the window's list view
     ProbeSelectRow,       // selects and focuses a row, as a click would
     ProbeEnterRow,        // selects a row and presses Enter on it
     ProbeDoubleClickRow,  // selects a row and double clicks the middle of its name

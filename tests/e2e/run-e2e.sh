@@ -5,35 +5,30 @@
 # prefix at the end. Ends with "N passed, M failed". VERRANT_EXE=path overrides the program under test.
 set -u
 cd "$(dirname "$0")/../.."
-build="$(pwd)/build/mingw" e2e="$(pwd)/build/e2e" shots="$(pwd)/build/e2e-shots"
+build="$PWD/build/mingw" e2e="$PWD/build/e2e" shots="$PWD/build/e2e-shots"
 program="${VERRANT_EXE:-$build/src/verrant.exe}" cli="$build/src/verrant-cli.exe"
 driver="$build/tests/e2e/e2e_driver.exe" probe="$build/tests/e2e/e2e_probe.dll"
-for file in "$program" "$driver" "$probe" "$cli"; do
-    [ -f "$file" ] || { echo "missing $file (build the MinGW configuration first)"; echo "0 passed, 1 failed"; exit 1; }
-done
+give_up() { echo "$1"; echo "0 passed, 1 failed"; exit 1; }
+for f in "$program" "$driver" "$probe" "$cli"; do [ -f "$f" ] || give_up "missing $f (build MinGW first)"; done
 windows_path() { echo "Z:${1//\//\\}"; }
 
-rm -rf "$e2e" && mkdir -p "$e2e/home/Desktop" "$shots" && rm -f "$shots"/*.png "$shots"/*.request
+rm -rf "$e2e" "$shots" && mkdir -p "$e2e/home/Desktop" "$shots"
 export WINEPREFIX="$e2e/prefix" HOME="$e2e/home" WINEDEBUG=-all WINEDLLOVERRIDES="mscoree,mshtml=" WINEARCH=win64
 export LC_ALL=C.UTF-8
 unset WAYLAND_DISPLAY
-xvfb_pid="" watcher_pid=""
 cleanup() {
-    [ -n "$watcher_pid" ] && kill "$watcher_pid" 2>/dev/null
     [ -d "$WINEPREFIX" ] && wineserver -k 2>/dev/null
-    [ -n "$xvfb_pid" ] && kill "$xvfb_pid" 2>/dev/null
+    kill $(jobs -p) 2>/dev/null  # the screenshot watcher and Xvfb
     wait 2>/dev/null
 }
 trap cleanup EXIT
 
-# Xvfb picks a free display number itself and writes it to the given descriptor once it is ready.
+# Xvfb picks a free display number itself and writes it to the descriptor once it is ready.
 Xvfb -displayfd 3 -screen 0 1280x1024x24 -nolisten tcp 3>"$e2e/display" 2>"$e2e/xvfb.log" &
-xvfb_pid=$!
 for _ in $(seq 100); do [ -s "$e2e/display" ] && break; sleep 0.1; done
-[ -s "$e2e/display" ] || { echo "Xvfb did not start"; echo "0 passed, 1 failed"; exit 1; }
+[ -s "$e2e/display" ] || give_up "Xvfb did not start"
 export DISPLAY=":$(head -n 1 "$e2e/display")"
 
-started=$(date +%s)
 wine wineboot -i >"$e2e/wineboot.log" 2>&1
 # Debian's Wine finds its own fonts (Tahoma, and Marlett for the caption buttons) only here.
 cp /usr/share/wine/fonts/* "$WINEPREFIX/drive_c/windows/Fonts/" 2>/dev/null
@@ -43,27 +38,27 @@ printf '%s\n' REGEDIT4 '[HKEY_CURRENT_USER\Software\Wine\Explorer]' '"Desktop"="
 wine regedit /S "$(windows_path "$e2e/settings.reg")" >>"$e2e/wineboot.log" 2>&1
 wineserver -k  # the next process starts the virtual desktop the prefix now names
 work="$WINEPREFIX/drive_c/verrant-e2e"
-mkdir -p "$work" && cp -r examples/demo-tree "$work/demo" && cp -r examples/demo-tree "$work/demo-cli"
-echo "prefix ready in $(($(date +%s) - started)) s"
+mkdir -p "$work/cli" && cp -r examples/demo-tree "$work/demo" && cp -r examples/demo-tree "$work/demo-cli"
+# Enough entries and mods to keep the mesh search, and with it the Wait window, busy for a while.
+big="$work/mesh-big/mods"
+for m in $(seq 0 299); do mkdir -p "$big/Mod$m/3do/Gen/F$((m % 100))"; done
+mkdir -p "$big/std/com/maddox/il2/objects" && awk 'BEGIN { printf "[***]\r\nTitle Generated\r\n"
+    for (i = 0; i < 20000; i++) printf "[buildings.House$Gen%d]\r\nMesh 3do/Gen/F%d/m%d.sim\r\n", i, i % 100, i
+}' >"$big/std/com/maddox/il2/objects/static.ini"
 
 # The driver asks for screenshots by leaving NAME.request files; this takes them.
-while true; do
+while sleep 0.1; do
     for request in "$shots"/*.request; do
-        [ -e "$request" ] && { import -window root "${request%.request}.png" 2>>"$e2e/import.log"; rm -f "$request"; }
+        [ -e "$request" ] && import -window root "${request%.request}.png" 2>>"$e2e/import.log"
+        rm -f "$request"
     done
-    sleep 0.1
 done &
-watcher_pid=$!
 
 # Wine processes inherit the driver's output: a file, so no pipe stays open behind them.
 started=$(date +%s)
 timeout 600 wine "$driver" "$(windows_path "$program")" "$(windows_path "$probe")" 'C:\verrant-e2e' \
     "$(windows_path "$shots")" "$(windows_path "$cli")" >"$e2e/driver.log" 2>"$e2e/driver-stderr.log"
-status=$?
 echo "scenarios took $(($(date +%s) - started)) s; screenshots in $shots"
 cat "$e2e/driver.log"
-if ! grep -qE '^[0-9]+ passed, [0-9]+ failed' "$e2e/driver.log"; then
-    echo "the driver ended without a result (status $status); its errors:"
-    tail -n 20 "$e2e/driver-stderr.log"
-    echo "0 passed, 1 failed"
-fi
+grep -qE '^[0-9]+ passed, [0-9]+ failed' "$e2e/driver.log" ||
+    give_up "the driver ended without a result; its errors: $(tail -n 20 "$e2e/driver-stderr.log")"
