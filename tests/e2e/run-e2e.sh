@@ -23,11 +23,15 @@ cleanup() {
 }
 trap cleanup EXIT
 
-# Xvfb picks a free display number itself and writes it to the descriptor once it is ready.
-Xvfb -displayfd 3 -screen 0 1280x1024x24 -nolisten tcp 3>"$e2e/display" 2>"$e2e/xvfb.log" &
-for _ in $(seq 100); do [ -s "$e2e/display" ] && break; sleep 0.1; done
-[ -s "$e2e/display" ] || give_up "Xvfb did not start"
-export DISPLAY=":$(head -n 1 "$e2e/display")"
+# A display number of its own, well above those a desktop session uses; the next one when taken.
+for display in $(seq 140 160); do
+    [ -e "/tmp/.X$display-lock" ] && continue
+    Xvfb ":$display" -screen 0 1280x1024x24 -nolisten tcp 2>"$e2e/xvfb.log" &
+    for _ in $(seq 50); do [ -e "/tmp/.X11-unix/X$display" ] && break; sleep 0.1; done
+    [ -e "/tmp/.X11-unix/X$display" ] && kill -0 $! 2>/dev/null && break
+done
+kill -0 $! 2>/dev/null || give_up "Xvfb did not start"
+export DISPLAY=":$display"
 
 wine wineboot -i >"$e2e/wineboot.log" 2>&1
 # Debian's Wine finds its own fonts (Tahoma, and Marlett for the caption buttons) only here.
