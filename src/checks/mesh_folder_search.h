@@ -1,4 +1,4 @@
-// Mode "missing": which mesh files of the index the 3do folder of some mod under the mods root holds.
+// The missing-meshes check: which mesh files of the index some mod's 3do folder under the mods root holds.
 #pragma once
 
 #include "checks/mesh_references.h"
