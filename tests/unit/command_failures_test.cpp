@@ -102,3 +102,15 @@ TEST_F(CommandFailuresTest, OutputThatCannotBeCreatedOrWritten) {
         }
     }
 }
+
+TEST_F(CommandFailuresTest, CatalogueThatCannotBeReplacedStaysAsItWas) {
+    for (const CommandCase& c : Cases) {
+        if (c.output != "static.ini.tmp") continue;
+        SCOPED_TRACE(c.name);
+        HeadlessFileFaults faults;
+        faults.failReplace = true;
+        EXPECT_EQ(Run(c, faults), CommandResult::Failed);
+        EXPECT_EQ(Messages(), Strings{"static.ini failure: Can't replace static.ini"});
+        ExpectNothingWritten(c);
+    }
+}

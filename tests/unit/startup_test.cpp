@@ -36,9 +36,12 @@ class StartupTest : public ScratchTest {
 }  // namespace
 
 TEST_F(StartupTest, FirstStartSavesTheChosenFolder) {
+    HeadlessScript(BrowserStep(Chooser, Folder("Sim"), "", false));
+    HeadlessScript(ChooserOkStep());  // a folder without static.ini keeps the chooser open
     ScriptChoosingTheCatalogue();
     EXPECT_EQ(RunVerrant(), 0);
-    EXPECT_EQ(Messages(), Strings({Question, "Path saved: Path saved in verrant.ini"}));
+    EXPECT_EQ(Messages(), Strings({Question, "Wrong folder selected: There is no 'static.ini'",
+                                   "Path saved: Path saved in verrant.ini"}));
     EXPECT_EQ(Read("start/verrant.ini"), catalogue);
     EXPECT_EQ(CatalogueFolder, catalogue);
     EXPECT_EQ(MapsPattern, Folder("Sim") + "Mods\\mapmods\\maps\\*.*");
