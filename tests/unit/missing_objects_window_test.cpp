@@ -35,16 +35,6 @@ protected:
     std::string status;
 };
 
-TEST_F(MissingObjectsWindowTest, FileListStartsAtTheMapsFolderOrTheDrives) {
-    for (const std::string pattern : {"D:\\Sim\\Mods\\mapmods\\maps\\*.*", ""}) {
-        HeadlessReset();
-        HeadlessScript(Look());
-        ShowMissingObjectsWindow(pattern);
-        Handle browser = HeadlessControlByKind(window, "browser");
-        EXPECT_EQ(HeadlessControlOf(browser)->browserPath, pattern.empty() ? "*.*" : pattern);
-    }
-}
-
 TEST_F(MissingObjectsWindowTest, OkWithoutAFilePickedSaysNoFileSelected) {
     const std::vector<std::vector<HeadlessStep>> scripts = {
         {},

@@ -2,7 +2,6 @@
 
 #include "platform/headless/headless.h"
 #include "output/app_state.h"
-#include "output/progress_list.h"
 
 #include <filesystem>
 #include <fstream>
@@ -62,12 +61,6 @@ Strings ScratchTest::Messages() const {
     Strings shown;
     for (const ShownMessage& message : HeadlessMessages()) shown.push_back(message.title + ": " + message.text);
     return shown;
-}
-
-void ScratchTest::SwitchListOn() {
-    ProgressListOn = true;
-    OpenProgressList();
-    AddProgressLine("left over from an earlier check");
 }
 
 void ScratchTest::Restart() {

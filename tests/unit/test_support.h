@@ -31,8 +31,6 @@ protected:
     Strings ProgressLines() const;
     // Titles and texts of the message boxes shown, as "Title: text".
     Strings Messages() const;
-    // Switches the progress list on, holding one line of an earlier check.
-    void SwitchListOn();
     // A fresh scratch folder and platform, for cases run in a loop.
     void Restart();
 
