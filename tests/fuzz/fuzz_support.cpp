@@ -68,5 +68,6 @@ void RequireBaseline(CommandResult result, const char* report, const char* basel
 void Require(bool holds, const std::string& what) {
     if (holds) return;
     std::fprintf(stderr, "property failed: %s\n", what.c_str());
+    fs::remove_all(Host.path);  // abort runs no destructor
     std::abort();
 }

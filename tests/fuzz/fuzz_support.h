@@ -21,5 +21,4 @@ void RunBaselineOnScratch(const char* baseline);
 // exactly when the report holds mark. A null mark is for a list: written, and Done.
 void RequireBaseline(CommandResult result, const char* report, const char* baseline, const char* mark = "",
                      bool (*unjudged)() = nullptr);
-// Stops the run with a message when a property fails; libFuzzer keeps the input.
-void Require(bool holds, const std::string& what);
+void Require(bool holds, const std::string& what);  // or stops the run; libFuzzer keeps the input
