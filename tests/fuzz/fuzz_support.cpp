@@ -30,7 +30,7 @@ std::string Fresh(const std::uint8_t* data, std::size_t size) {
     fs::create_directories(Host.path + "/Desktop");
     HeadlessSetDesktopFolder(Scratch + "Desktop\\");
     WriteFile("static.ini", bytes);
-    if ((ProgressListOn = size > 0 && (data[0] & 1))) OpenProgressList();
+    if ((ProgressListOn = size % 2)) OpenProgressList();
     return bytes;
 }
 

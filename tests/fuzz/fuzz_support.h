@@ -10,7 +10,7 @@
 extern const std::string Scratch;  // as the program names it, ending in "\"; removed at exit
 
 // A fresh start for one input: platform and application state reset, the desktop emptied, the bytes
-// written as static.ini and the progress list on for an odd first byte. Gives the bytes.
+// written as static.ini and the progress list on for an odd size. Gives the bytes.
 std::string Fresh(const std::uint8_t* data, std::size_t size);
 void WriteFile(const std::string& name, const std::string& bytes);  // names below Scratch, "/" between
 std::string ReadFile(const std::string& name, bool* exists = nullptr);
