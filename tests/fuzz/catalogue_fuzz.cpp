@@ -73,8 +73,9 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     RequireBaseline(CreateMissionBuilderList(Scratch, BuilderList::FmbPlus), "Static_list_FMBplus.txt",
                     "entry-list-plus", nullptr);
     for (const char* file :
-         {"mods/Pack/3do/a.sim", "mods/Pack/3do/Buildings/Barn/live.sim", "mods/Caps/3DO/c.sim",
-          "mods/3do/Furniture/Bench/mono.sim", "3do/Trees/Birch/mono.sim", "mods/Old/3do_old/f.sim"})
+         {"mods/Pack/3do/Buildings/Pier/live.sim", "mods/Caps/3DO/Buildings/Boathouse/mono.sim",
+          "mods/3do/Buildings/Kiosk/live.sim", "3do/Buildings/Chapel/live.sim",
+          "mods/Old/3do_old/Buildings/Mill/mono.sim"})
         WriteFile(file, "");
     RequireBaseline(CheckMeshReferences(Scratch, Scratch + "mods\\", MeshCheck::SharedLiveDeadMeshes),
                     "Doubled_sims_or_meshes.txt", "mesh-index", "\r\nMeshLive: ");
