@@ -321,11 +321,12 @@ bool OpenPerMeshPerFolder(const BaselineInput& input) {
         }
         bool liveMissing = !entry.meshLive.empty() && !entry.meshLiveFound;
         bool deadMissing = !entry.meshDead.empty() && !entry.meshDeadFound;
+        // Both are named when both are missing: a report of missing files must not drop one.
         if (liveMissing || deadMissing) {
-            for (const std::string& line : {std::string("**************"), object, entry.sectionName,
-                                            liveMissing ? "Not found: MeshLive " + entry.meshLive
-                                                        : "Not found: MeshDead " + entry.meshDead})
+            for (const std::string& line : {std::string("**************"), object, entry.sectionName})
                 report.Line(line);
+            if (liveMissing) report.Line("Not found: MeshLive " + entry.meshLive);
+            if (deadMissing) report.Line("Not found: MeshDead " + entry.meshDead);
             any = true;
         }
     }
