@@ -1,128 +1,91 @@
+// The settings file and the start-up that reads it: one line, the catalogue folder, no line end.
 #include "location/settings.h"
 
-#include "platform/headless/headless.h"
 #include "output/app_state.h"
+#include "shell/main_window.h"
+#include "shell/startup.h"
 #include "test_support.h"
 
 namespace {
 
+const std::string Main = "Verrant V.1.3", Chooser = "Searching static.ini";
+const std::string Question = "Path to static.ini: Select path to static.ini (..\\mods\\STD\\com\\..\\objects) first";
+
 class SettingsTest : public ScratchTest {
-   protected:
+protected:
     void SetUp() override {
         ScratchTest::SetUp();
         Write("start/readme.txt", "");
         StartFolder = Folder("start");
+        MakeFolderCurrent(StartFolder);
         catalogue = Folder("Sim/MODS/STD/com/maddox/il2/objects");
-        Write("Sim/MODS/STD/com/maddox/il2/objects/static.ini", "[***]\r\n");
+        Write("Sim/MODS/STD/com/maddox/il2/objects/static.ini", "[buildings.House$A]\r\n");
     }
-    // The maps pattern the catalogue folder above gives: the path's own "M", the rest as written.
-    std::string CatalogueMapsPattern() const { return Folder("Sim") + "Mods\\mapmods\\maps\\*.*"; }
-    std::string Current() const { return CurrentFolder() + "\\"; }
-
+    // The maps pattern of the catalogue folder: the path's own "M", the rest as written.
+    std::string MapsOfCatalogue() const { return Folder("Sim") + "Mods\\mapmods\\maps\\*.*"; }
+    void ScriptChoosing(const std::string& folder) {
+        HeadlessScript(BrowserStep(Chooser, folder, "", false));
+        HeadlessScript(ChooserOkStep());
+    }
     std::string catalogue;
 };
 
 }  // namespace
 
 TEST_F(SettingsTest, OnlyTheFirstLineNamesTheFolder) {
-    const Strings rests = {
-        "", "\r\nD:\\other\\", "\nD:\\other\\", "\rD:\\other\\", std::string("\0tail", 5), "\r\n"};
-    for (const std::string& rest : rests) {
+    for (const std::string rest : {"", "\r\nD:\\other\\", "\nD:\\x\\", "\rD:\\x\\", "\r\n"}) {
         SCOPED_TRACE(rest);
-        HeadlessReset();
         CatalogueFolder = MapsPattern = "";
         Write("start/verrant.ini", catalogue + rest);
         EXPECT_FALSE(LoadSettings(StartFolder));
         EXPECT_EQ(CatalogueFolder, catalogue);
-        EXPECT_EQ(MapsPattern, CatalogueMapsPattern());
-        EXPECT_EQ(Current(), catalogue);
-        EXPECT_EQ(Read("start/verrant.ini"), catalogue + rest);
+        EXPECT_EQ(MapsPattern, MapsOfCatalogue());
         EXPECT_EQ(Messages(), Strings{});
     }
-}
-
-TEST_F(SettingsTest, NoSettingsFileLeavesTheStateAsItWas) {
-    CatalogueFolder = "D:\\kept\\";
-    MapsPattern = "D:\\mods\\mapmods\\maps\\*.*";
-    EXPECT_TRUE(LoadSettings(StartFolder));
-    EXPECT_EQ(CatalogueFolder, "D:\\kept\\");
-    EXPECT_EQ(MapsPattern, "D:\\mods\\mapmods\\maps\\*.*");
-    EXPECT_EQ(Messages(), Strings{});
-    EXPECT_TRUE(LoadSettings(Folder("no such start")));
-}
-
-// A lost folder is told, forgotten and dropped from the settings file, and no question follows.
-TEST_F(SettingsTest, FolderWithoutCatalogueIsForgotten) {
-    struct Case {
-        std::string name, firstLine;
-        bool startHoldsCatalogue;
-    };
-    const std::vector<Case> cases = {
-        {"emptied folder", Folder("Sim/emptied"), false},
-        {"deleted folder", Folder("Sim/gone"), false},
-        {"deleted folder, catalogue in the start folder", Folder("Sim/gone"), true},
-        {"empty first line", "", false},
-        {"empty first line, catalogue in the start folder", "", true},
-    };
-    Write("Sim/emptied/readme.txt", "");
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.name);
-        HeadlessReset();
-        CatalogueFolder = MapsPattern = "";
-        Write("start/verrant.ini", c.firstLine + "\r\nsecond line");
-        if (c.startHoldsCatalogue) Write("start/static.ini", "[***]\r\n");
-        EXPECT_FALSE(LoadSettings(StartFolder));
-        EXPECT_EQ(Messages(), Strings({"static,ini failure: static.ini not found in " + c.firstLine}));
-        EXPECT_EQ(CatalogueFolder, "");
-        EXPECT_EQ(MapsPattern, "");
-        EXPECT_FALSE(Exists("start/verrant.ini"));
-        EXPECT_TRUE(Exists("start/readme.txt"));
-        EXPECT_EQ(Current(), StartFolder);
-    }
-}
-
-TEST_F(SettingsTest, SavedFileIsTheFolderWithoutLineEnd) {
-    Write("start/verrant.ini", "D:\\a much longer folder path than the new one\\\r\nmore\r\n");
-    CatalogueFolder = "D:\\known\\";
-    MapsPattern = "D:\\mods\\mapmods\\maps\\*.*";
-    MakeFolderCurrent(catalogue);
-    EXPECT_TRUE(SavePath(catalogue, StartFolder));
-    EXPECT_EQ(Read("start/verrant.ini"), catalogue);
-    EXPECT_FALSE(Exists("Sim/MODS/STD/com/maddox/il2/objects/verrant.ini"));
-    EXPECT_EQ(Messages(), Strings({"Path saved: Path saved in verrant.ini"}));
-    EXPECT_EQ(CatalogueFolder, "D:\\known\\");
-    EXPECT_EQ(MapsPattern, "D:\\mods\\mapmods\\maps\\*.*");
-
-    LoadSettings(StartFolder);
+    std::remove(Host("start/verrant.ini").c_str());
+    EXPECT_TRUE(LoadSettings(StartFolder)) << "no settings file: the state stays";
     EXPECT_EQ(CatalogueFolder, catalogue);
 }
 
-TEST_F(SettingsTest, UnwritableSettingsFileIsNotCalledSaved) {
-    struct Case {
-        std::string name;
-        HeadlessFileFaults faults;
-        std::string startFolder;
-        std::string leftBehind;  // what verrant.ini in the start folder holds afterwards; "" for none
-    };
-    HeadlessFileFaults cannotCreate, cannotWrite;
-    cannotCreate.failCreate = "verrant.ini";
-    cannotWrite.failWriteName = "verrant.ini";
-    cannotWrite.failWriteAfterBytes = 4;
-    const std::vector<Case> cases = {
-        {"cannot create", cannotCreate, Folder("start"), "old"},
-        {"write cut off", cannotWrite, Folder("start"), ""},
-        {"start folder gone", HeadlessFileFaults(), Folder("gone"), "old"},
-    };
-    for (const Case& c : cases) {
-        SCOPED_TRACE(c.name);
+// A lost folder is told, forgotten and dropped from the settings file, even when the start folder
+// holds a catalogue of its own.
+TEST_F(SettingsTest, FolderWithoutCatalogueIsForgotten) {
+    Write("Sim/emptied/readme.txt", "");
+    for (const std::string& firstLine : {Folder("Sim/emptied"), Folder("Sim/gone"), std::string()}) {
+        SCOPED_TRACE(firstLine);
         HeadlessReset();
-        Write("start/verrant.ini", "old");
+        Write("start/verrant.ini", firstLine + "\r\nsecond line");
+        Write("start/static.ini", "[***]\r\n");
+        EXPECT_FALSE(LoadSettings(StartFolder));
+        EXPECT_EQ(Messages(), Strings({"static,ini failure: static.ini not found in " + firstLine}));
+        EXPECT_EQ(CatalogueFolder + MapsPattern, "");
+        EXPECT_FALSE(Exists("start/verrant.ini"));
+        EXPECT_TRUE(Exists("start/readme.txt"));
+    }
+}
+
+TEST_F(SettingsTest, SavingWritesTheFolderWithoutLineEndOrSaysItCannot) {
+    HeadlessFileFaults cannotCreate, cannotWrite;
+    cannotCreate.failCreate = cannotWrite.failWriteName = "verrant.ini";
+    cannotWrite.failWriteAfterBytes = 4;
+    const struct {
+        HeadlessFileFaults faults;
+        std::string startFolder, message, left;  // left: what verrant.ini holds afterwards
+    } cases[] = {
+        {{}, Folder("start"), "Path saved: Path saved in verrant.ini", catalogue},
+        {cannotCreate, Folder("start"), "Path not saved: Can't write verrant.ini in " + Folder("start"), "old\r\nmore"},
+        {cannotWrite, Folder("start"), "Path not saved: Can't write verrant.ini in " + Folder("start"), ""},
+        {{}, Folder("gone"), "Path not saved: Can't write verrant.ini in " + Folder("gone"), "old\r\nmore"},
+    };
+    for (const auto& c : cases) {
+        SCOPED_TRACE(c.message);
+        HeadlessReset();
+        Write("start/verrant.ini", "old\r\nmore");
         HeadlessSetFileFaults(c.faults);
         MakeFolderCurrent(catalogue);
-        EXPECT_FALSE(SavePath(catalogue, c.startFolder));
-        EXPECT_EQ(Messages(), Strings({"Path not saved: Can't write verrant.ini in " + c.startFolder}));
-        EXPECT_EQ(Exists("start/verrant.ini"), !c.leftBehind.empty());
-        EXPECT_EQ(Read("start/verrant.ini"), c.leftBehind);
+        EXPECT_EQ(SavePath(catalogue, c.startFolder), c.left == catalogue);
+        EXPECT_EQ(Messages(), Strings{c.message});
+        EXPECT_EQ(Read("start/verrant.ini"), c.left);
         EXPECT_FALSE(Exists("Sim/MODS/STD/com/maddox/il2/objects/verrant.ini"));
     }
 }
@@ -133,12 +96,49 @@ TEST_F(SettingsTest, ClearTwiceDeletesThenHasNothingToClear) {
     // The catalogue folder is current now; a file of the same name there is not the settings file.
     Write("Sim/MODS/STD/com/maddox/il2/objects/verrant.ini", "decoy");
     ClearPath();
-    EXPECT_FALSE(Exists("start/verrant.ini"));
-    EXPECT_TRUE(Exists("Sim/MODS/STD/com/maddox/il2/objects/verrant.ini"));
-    EXPECT_EQ(CatalogueFolder, "");
-    EXPECT_EQ(MapsPattern, "");
     ClearPath();
-    EXPECT_EQ(Messages(),
-              Strings({"Path cleared: verrant.ini deleted", "Path cleared failure: Nothing to clear"}));
+    EXPECT_EQ(Messages(), Strings({"Path cleared: verrant.ini deleted", "Path cleared failure: Nothing to clear"}));
+    EXPECT_TRUE(Exists("Sim/MODS/STD/com/maddox/il2/objects/verrant.ini"));
+    EXPECT_EQ(CatalogueFolder + MapsPattern, "");
 }
 
+TEST_F(SettingsTest, FirstStartAsksAndSavesTheChosenFolder) {
+    ScriptChoosing(Folder("Sim"));  // no static.ini there: the chooser stays open
+    ScriptChoosing(catalogue);
+    EXPECT_EQ(RunVerrant(), 0);
+    EXPECT_EQ(Messages(), Strings({Question, "Wrong folder selected: There is no 'static.ini'",
+                                   "Path saved: Path saved in verrant.ini"}));
+    EXPECT_EQ(Read("start/verrant.ini"), catalogue);
+    EXPECT_EQ(MapsPattern, MapsOfCatalogue());
+    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main, Chooser}));
+}
+
+TEST_F(SettingsTest, FolderThatCannotBeSavedServesThisRun) {
+    HeadlessFileFaults faults;
+    faults.failCreate = "verrant.ini";
+    HeadlessSetFileFaults(faults);
+    ScriptChoosing(catalogue);
+    EXPECT_EQ(RunVerrant(), 0);
+    EXPECT_EQ(Messages(), Strings({Question, "Path not saved: Can't write verrant.ini in " + Folder("start")}));
+    EXPECT_EQ(CatalogueFolder, catalogue);
+    EXPECT_EQ(MapsPattern, MapsOfCatalogue());
+}
+
+TEST_F(SettingsTest, ChooserClosedAtStartAsksAgainAtTheFirstCommand) {
+    MakeFolderCurrent("\\");  // a start folder that is a root ends in one backslash
+    HeadlessScript(CloseStep(Chooser));
+    HeadlessScript(ControlStep(Main, ProgressToggleId));
+    HeadlessScript(MenuStep(Main, MenuDoubledObjects));
+    EXPECT_EQ(RunVerrant(), 0);
+    EXPECT_EQ(StartFolder, "\\");
+    EXPECT_EQ(Messages(), Strings({Question}));
+    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main, Chooser, "List searching window", Chooser}));
+    for (const std::string& title : HeadlessWindowTitlesOpened()) EXPECT_EQ(HeadlessFindWindow(title), 0u);
+}
+
+TEST_F(SettingsTest, LostFolderAtStartIsToldWithoutAQuestion) {
+    Write("start/verrant.ini", Folder("Sim/gone"));
+    EXPECT_EQ(RunVerrant(), 0);
+    EXPECT_EQ(Messages(), Strings({"static,ini failure: static.ini not found in " + Folder("Sim/gone")}));
+    EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main}));
+}
