@@ -2,19 +2,12 @@
 #include "fuzz_support.h"
 
 #include "checks/empty_references.h"
-#include "output/app_state.h"
 
 #include <string_view>
 
-namespace {
-
-CommandResult FindInScratchCatalogue() { return FindEmptyReferences(CatalogueFolder); }
-
-}  // namespace
-
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
     CommandResult result =
-        RunCheckAgainstBaseline(data, size, FindInScratchCatalogue, "Empty_references.txt", "bare-keys", false);
+        RunCheckAgainstBaseline(data, size, FindEmptyReferences, "Empty_references.txt", "bare-keys", false);
     bool written = false;
     std::string report = ReadDesktopFile("Empty_references.txt", written);
     bool none = std::string_view(report).ends_with("\r\n\r\nNo empty references found in your static.ini") &&

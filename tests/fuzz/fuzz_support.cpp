@@ -86,7 +86,7 @@ std::string BaselineOutput(const std::string& baseline, const std::string& repor
     return rewrite ? ReadScratchFile("copy/static.ini", exists) : ReadScratchFile("baseline/" + report, exists);
 }
 
-CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
+CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(const std::string& catalogueFolder),
                                       const std::string& report, const std::string& baseline,
                                       bool reportOnlyWithFindings) {
     ResetForInput();
@@ -94,7 +94,7 @@ CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size
     CatalogueFolder = ScratchFolder();
     ProgressListOn = size > 0 && (data[0] & 1);
     if (ProgressListOn) OpenProgressList();
-    CommandResult result = check();
+    CommandResult result = check(ScratchFolder());
     bool written = false, expected = false;
     std::string text = ReadDesktopFile(report, written);
     std::string plain = BaselineOutput(baseline, report, expected);
@@ -112,12 +112,12 @@ void Require(bool holds, const char* what) {
 
 std::vector<std::string> CatalogueLinesOf(const std::string& bytes, bool trimmed) {
     WriteScratchFile("static.ini", bytes);
-    CatalogueReader reader;
+    std::string read;
+    Require(ReadWholeFile(ScratchFolder(), "static.ini", read) == FileRead::Whole, "the scratch catalogue reads");
+    LineReader reader = LinesOf(read);
     std::vector<std::string> lines;
-    Require(OpenCatalogue(ScratchFolder(), reader), "the scratch catalogue opens");
-    std::string line;
-    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.push_back(line);
-    CloseCatalogue(reader);
+    std::string_view line;
+    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.emplace_back(line);
     return lines;
 }
 

@@ -26,7 +26,7 @@ std::string BaselineOutput(const std::string& baseline, const std::string& repor
 // Runs a catalogue check on the input as static.ini (the progress list on for an odd first byte)
 // and requires its report to be the baseline's, byte for byte, or both to write none. For a check
 // that writes its report only with findings, the result must say whether it did. Gives the result.
-CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(),
+CommandResult RunCheckAgainstBaseline(const std::uint8_t* data, std::size_t size, CommandResult (*check)(const std::string& catalogueFolder),
                                       const std::string& report, const std::string& baseline,
                                       bool reportOnlyWithFindings);
 // Stops the run with a message when a property fails; libFuzzer keeps the input.
