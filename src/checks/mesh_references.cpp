@@ -234,21 +234,39 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
     return reported;
 }
 
-CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
-    const bool missingMode = check == MeshCheck::MissingMeshes;
-    Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
-    Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);
+namespace {
+
+struct MeshRun {
+    Handle waitWindow = 0;
+    Handle bar = 0;
+};
+
+MeshRun StartMeshRun() {
+    MeshRun run;
+    run.waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
+    run.bar = AddProgressBar(run.waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
         ClearProgressList();
         AddLines({StepRuler, "Building object index"});
     }
-    std::string catalogue;
-    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
-    if (read != FileRead::Whole) {
-        CloseTopWindow(waitWindow);
-        TellCatalogueFailure(read, CantOpenCatalogue);
-        return CommandResult::Failed;
+    return run;
+}
+
+int CountMeshFindings(const std::vector<MeshIndexEntry>& index, MeshCheck check) {
+    int findings = 0;
+    for (const MeshIndexEntry& entry : index) {
+        if (check == MeshCheck::SharedLiveDeadMeshes) {
+            findings += SharesLiveDeadMesh(entry);
+        } else if (!entry.title.empty()) {
+            for (const MeshSlot& slot : MeshSlots) findings += IsMissing(entry.*slot.value, entry.*slot.found);
+        }
     }
+    return findings;
+}
+
+CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogue, const std::string& modsRoot,
+                            MeshCheck check, int& findings) {
+    const bool missingMode = check == MeshCheck::MissingMeshes;
     std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
     ExcludeStandardTitles(index);
     if (ProgressListOn) {
@@ -257,12 +275,12 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
         DrainPendingEvents();
     }
     if (missingMode) {
-        SearchModMeshFolders(index, modsRoot, bar);
+        SearchModMeshFolders(index, modsRoot, run.bar);
         if (ProgressListOn) ReportMissingMeshes(index, MeshOutput::ProgressList, AddProgressLine);
     } else if (ProgressListOn) {
         ReportSharedLiveDeadMeshes(index, MeshOutput::ProgressList, AddProgressLine);
     }
-    CloseTopWindow(waitWindow);
+    CloseTopWindow(run.waitWindow);
 
     ReportFile report;
     if (!CreateReport(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report))
@@ -277,6 +295,28 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
     LineSink toReport = [&report](const std::string& line) { WriteReportLine(report, line); };
     bool reported = missingMode ? ReportMissingMeshes(index, MeshOutput::ReportBody, toReport)
                                 : ReportSharedLiveDeadMeshes(index, MeshOutput::ReportBody, toReport);
+    findings = CountMeshFindings(index, check);
     if (!FinishReport(report)) return CommandResult::Failed;
     return reported ? CommandResult::Findings : CommandResult::NothingFound;
+}
+
+}  // namespace
+
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
+    MeshRun run = StartMeshRun();
+    std::string catalogue;
+    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
+    if (read != FileRead::Whole) {
+        CloseTopWindow(run.waitWindow);
+        TellCatalogueFailure(read, CantOpenCatalogue);
+        return CommandResult::Failed;
+    }
+    int findings = 0;
+    return FinishMeshRun(run, catalogue, modsRoot, check, findings);
+}
+
+CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
+                                             int& findings) {
+    findings = 0;
+    return FinishMeshRun(StartMeshRun(), catalogue, modsRoot, check, findings);
 }

@@ -52,3 +52,7 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
 enum class MeshCheck { MissingMeshes, SharedLiveDeadMeshes };
 // The whole run of one of the two checks; modsRoot ends in "\". Always writes and opens its report.
 CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check);
+// The same on the catalogue's bytes, read already; findings is the number of missing meshes, or of
+// entries whose live and dead meshes are one file.
+CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
+                                             int& findings);
