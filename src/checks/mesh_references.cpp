@@ -189,18 +189,18 @@ std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue) {
 
 // One pass sorts the entries of standard groups by their title, in index order; the titles are then
 // excluded one after the other as before, without a walk over the whole index for each of the 42.
-void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
-    if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "});
+void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add) {
+    if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "}, add);
     std::unordered_map<std::string_view, std::size_t> titlePlace;
     for (std::size_t t = 0; t < StandardTitles.size(); ++t) titlePlace.emplace(StandardTitles[t], t);
     std::vector<std::vector<MeshIndexEntry*>> byTitle(StandardTitles.size());
     for (MeshIndexEntry& entry : index)
         if (auto place = titlePlace.find(entry.title); place != titlePlace.end()) byTitle[place->second].push_back(&entry);
     for (std::size_t t = 0; t < StandardTitles.size(); ++t) {
-        if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "});
+        if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "}, add);
         DrainPendingEvents();
         for (MeshIndexEntry* entry : byTitle[t]) {
-            if (ProgressListOn) AddProgressLine("Excluding " + std::string(entry->sectionName));
+            if (ProgressListOn) add("Excluding " + std::string(entry->sectionName));
             entry->title = {};
         }
     }
@@ -265,10 +265,19 @@ int CountMeshFindings(const std::vector<MeshIndexEntry>& index, MeshCheck check)
 }
 
 CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogue, const std::string& modsRoot,
-                            MeshCheck check, int& findings) {
+                            MeshCheck check, SharedMeshIndex& shared, int& findings) {
     const bool missingMode = check == MeshCheck::MissingMeshes;
-    std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
-    ExcludeStandardTitles(index);
+    if (!shared.made) {
+        shared.entries = BuildMeshIndex(catalogue);
+        ExcludeStandardTitles(shared.entries, [&shared](const std::string& line) {
+            AddProgressLine(line);
+            shared.progressLines.push_back(line);
+        });
+        shared.made = true;
+    } else if (ProgressListOn) {
+        for (const std::string& line : shared.progressLines) AddProgressLine(line);
+    }
+    std::vector<MeshIndexEntry>& index = shared.entries;
     if (ProgressListOn) {
         DrainPendingEvents();
         AddLines({" ", StepRuler, "Searching folders & files", " "});
@@ -312,11 +321,12 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
         return CommandResult::Failed;
     }
     int findings = 0;
-    return FinishMeshRun(run, catalogue, modsRoot, check, findings);
+    SharedMeshIndex index;
+    return FinishMeshRun(run, catalogue, modsRoot, check, index, findings);
 }
 
 CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
-                                             int& findings) {
+                                             SharedMeshIndex& index, int& findings) {
     findings = 0;
-    return FinishMeshRun(StartMeshRun(), catalogue, modsRoot, check, findings);
+    return FinishMeshRun(StartMeshRun(), catalogue, modsRoot, check, index, findings);
 }

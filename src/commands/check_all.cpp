@@ -11,38 +11,46 @@
 
 namespace {
 
+// What the steps of one run share: the catalogue's bytes and the mesh index.
+struct SharedRead {
+    std::string catalogue;
+    SharedMeshIndex meshIndex;
+};
+
 struct CheckStep {
     const char* name;    // as verrant-cli names the single command
     const char* report;  // the report the single command writes
-    CommandResult (*run)(const std::string& catalogue, const CommandInput& input, int& findings);
+    CommandResult (*run)(SharedRead& read, const CommandInput& input, int& findings);
 };
 
 // The order a builder reads them in: the catalogue's own faults first, then its meshes, then maps.
 const CheckStep Steps[] = {
     {"doubled-objects", "Doubled_objects.txt",
-     [](const std::string& catalogue, const CommandInput&, int& findings) {
-         return FindDoubledObjectsInCatalogue(catalogue, findings);
+     [](SharedRead& read, const CommandInput&, int& findings) {
+         return FindDoubledObjectsInCatalogue(read.catalogue, findings);
      }},
     {"irregular-entries", "Irregular_entrys.txt",
-     [](const std::string& catalogue, const CommandInput&, int& findings) {
-         return CheckIrregularEntriesInCatalogue(catalogue, findings);
+     [](SharedRead& read, const CommandInput&, int& findings) {
+         return CheckIrregularEntriesInCatalogue(read.catalogue, findings);
      }},
     {"empty-references", "Empty_references.txt",
-     [](const std::string& catalogue, const CommandInput&, int& findings) {
-         return FindEmptyReferencesInCatalogue(catalogue, findings);
+     [](SharedRead& read, const CommandInput&, int& findings) {
+         return FindEmptyReferencesInCatalogue(read.catalogue, findings);
      }},
     {"wrong-sim-references", "Missing_3do.txt",
-     [](const std::string& catalogue, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(catalogue, input.modsRoot, MeshCheck::MissingMeshes, findings);
+     [](SharedRead& read, const CommandInput& input, int& findings) {
+         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::MissingMeshes, read.meshIndex,
+                                                   findings);
      }},
     {"doubled-used-sims", "Doubled_sims_or_meshes.txt",
-     [](const std::string& catalogue, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(catalogue, input.modsRoot, MeshCheck::SharedLiveDeadMeshes, findings);
+     [](SharedRead& read, const CommandInput& input, int& findings) {
+         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::SharedLiveDeadMeshes,
+                                                   read.meshIndex, findings);
      }},
     {"missing-objects --all-maps", "Missing_objects_all_maps.txt",
-     [](const std::string& catalogue, const CommandInput& input, int& findings) {
+     [](SharedRead& read, const CommandInput& input, int& findings) {
          AllMapsCount count;
-         CommandResult result = FindMissingObjectsOfAllMaps(catalogue, input.mapsFolder, count);
+         CommandResult result = FindMissingObjectsOfAllMaps(read.catalogue, input.mapsFolder, count);
          findings = count.namesMissing + count.notMaps;
          return result;
      }},
@@ -58,14 +66,14 @@ std::string SummaryLine(const std::string& name, const std::string& count, const
 }  // namespace
 
 CommandResult CheckAll(const CommandInput& input) {
-    std::string catalogue;
-    bool read = LoadCatalogue(input.catalogueFolder, catalogue, CantOpenCatalogue);
+    SharedRead shared;
+    bool read = LoadCatalogue(input.catalogueFolder, shared.catalogue, CantOpenCatalogue);
     bool failed = !read, found = false;
     int total = 0;
     std::vector<std::string> lines;
     for (const CheckStep& step : Steps) {
         int findings = 0;
-        CommandResult result = read ? step.run(catalogue, input, findings) : CommandResult::Failed;
+        CommandResult result = read ? step.run(shared, input, findings) : CommandResult::Failed;
         if (result == CommandResult::Failed) {
             failed = true;
             lines.push_back(SummaryLine(step.name, "-", "could not run"));
