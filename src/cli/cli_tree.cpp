@@ -15,10 +15,11 @@ bool UseTreeCatalogue(const std::string& treeFolder) {
     }
     TreeFolders found;
     if (!FindCatalogueInTree(treeFolder, found)) {
-        std::fprintf(stderr,
-                     "verrant-cli: static.ini not found: looked for mods/std/com/maddox/il2/objects/static.ini, "
-                     "in any letter case, in %s and in every folder above it\n",
-                     host.c_str());
+        std::fprintf(
+            stderr,
+            "verrant-cli: static.ini not found: looked for mods/std/com/maddox/il2/objects/static.ini, "
+            "in any letter case, in %s and in every folder above it\n",
+            host.c_str());
         return false;
     }
     CatalogueFolder = found.catalogueFolder;

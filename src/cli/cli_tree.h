@@ -1,7 +1,7 @@
 // verrant-cli's --tree and the maps folder: where a run finds its catalogue and maps.
 #pragma once
 
-#include "cli/cli_options.h"
+#include <string>
 
 // Finds the catalogue of the tree named by --tree and makes it the catalogue folder, with the
 // maps folder of the same tree; says on standard error where it found it, or where it looked.

@@ -39,13 +39,13 @@ const CheckStep Steps[] = {
      }},
     {"wrong-sim-references", "Missing_3do.txt",
      [](SharedRead& read, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::MissingMeshes, read.meshIndex,
-                                                   findings);
+         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::MissingMeshes,
+                                               read.meshIndex, findings);
      }},
     {"doubled-used-sims", "Doubled_sims_or_meshes.txt",
      [](SharedRead& read, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::SharedLiveDeadMeshes,
-                                                   read.meshIndex, findings);
+         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot,
+                                               MeshCheck::SharedLiveDeadMeshes, read.meshIndex, findings);
      }},
     {"missing-objects --all-maps", "Missing_objects_all_maps.txt",
      [](SharedRead& read, const CommandInput& input, int& findings) {

@@ -22,8 +22,8 @@ struct MapFindings {
 
 // Depth first, each folder in the order the listing gives (names by their upper case, as NTFS
 // keeps them), so the paths come out in path order without regard to letter case.
-void CollectMapFiles(const std::vector<FolderEntry>& entries, const std::string& folder, const std::string& relative,
-                     std::vector<std::string>& mapFiles) {
+void CollectMapFiles(const std::vector<FolderEntry>& entries, const std::string& folder,
+                     const std::string& relative, std::vector<std::string>& mapFiles) {
     for (const FolderEntry& entry : entries) {
         if (entry.name == "." || entry.name == "..") continue;
         if (!entry.isFolder) {
@@ -55,7 +55,8 @@ std::vector<std::string> MissingNamesOnce(const std::vector<std::string>& mapNam
     return missing;
 }
 
-CommandResult WriteAllMapsReport(const std::vector<MapFindings>& maps, const std::vector<std::string>& notMaps) {
+CommandResult WriteAllMapsReport(const std::vector<MapFindings>& maps,
+                                 const std::vector<std::string>& notMaps) {
     ReportFile report;
     if (!CreateReport("Missing_objects_all_maps.txt", report)) return CommandResult::Failed;
     WriteReportLine(report, "Missing objects of all maps in your static.ini:");
@@ -129,7 +130,8 @@ CommandResult FindMissingObjectsOfAllMaps(const std::string& catalogue, const st
     return WriteAllMapsReport(maps, notMaps);
 }
 
-CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder, AllMapsCount& count) {
+CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
+                           AllMapsCount& count) {
     count = AllMapsCount();
     std::string catalogue;
     if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;

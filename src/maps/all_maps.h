@@ -28,4 +28,5 @@ std::string AllMapsSummary(const AllMapsCount& count);
 CommandResult FindMissingObjectsOfAllMaps(const std::string& catalogue, const std::string& mapsFolder,
                                           AllMapsCount& count);
 // The same after reading static.ini in the catalogue folder.
-CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder, AllMapsCount& count);
+CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
+                           AllMapsCount& count);
