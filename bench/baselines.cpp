@@ -4,10 +4,12 @@
 #include "catalogue/text.h"
 #include "checks/mesh_references.h"
 
+#include <algorithm>
 #include <cstdio>
 #include <cstring>
 #include <dirent.h>
 #include <functional>
+#include <set>
 #include <string>
 #include <sys/stat.h>
 #include <vector>
@@ -338,13 +340,17 @@ bool OpenPerMeshPerFolder(const BaselineInput& input) {
 
 //--- the map check: names read from the map's first bytes, each looked up by a walk from the start
 
-bool LinearNameWalk(const BaselineInput& input) {
-    std::FILE* map = OpenRead(input.mapFile);
-    if (!map) return false;
-    std::vector<char> bytes(140000);
-    bytes.resize(std::fread(bytes.data(), 1, bytes.size(), map));
-    std::fclose(map);
-    std::string text;
+std::string FilePrefix(const std::string& path, std::size_t size) {
+    std::FILE* file = OpenRead(path);
+    if (!file) return "";
+    std::string bytes(size, '\0');
+    bytes.resize(std::fread(bytes.data(), 1, bytes.size(), file));
+    std::fclose(file);
+    return bytes;
+}
+
+std::vector<std::string> PlacedNames(const std::string& mapFile) {
+    std::string bytes = FilePrefix(mapFile, 140000), text;
     for (char byte : bytes) {
         unsigned char value = static_cast<unsigned char>(byte);
         if (value == 0) text += ' ';
@@ -357,7 +363,14 @@ bool LinearNameWalk(const BaselineInput& input) {
         placed.push_back(text.substr(at, blank - at));
         at = blank;
     }
+    return placed;
+}
 
+bool LinearNameWalk(const BaselineInput& input) {
+    std::FILE* map = OpenRead(input.mapFile);
+    if (!map) return false;
+    std::fclose(map);
+    std::vector<std::string> placed = PlacedNames(input.mapFile);
     std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
     if (!file) return false;
     std::vector<std::string> names = SectionNamesByBracket(file);
@@ -369,6 +382,75 @@ bool LinearNameWalk(const BaselineInput& input) {
         if (!found) missing.push_back(name);
     }
     return WriteFindings(input, "Missing_objects.txt", "Missing objects in your static.ini:", missing);
+}
+
+//--- every map: a walk of the maps folder sorted afterwards, the section names in one set
+
+// The path parts below folder of each file named actors.static in any letter case.
+void FindMapFiles(const std::string& folder, std::vector<std::string>& parts, std::vector<std::vector<std::string>>& found) {
+    DIR* dir = opendir(folder.c_str());
+    if (!dir) return;
+    while (dirent* entry = readdir(dir)) {
+        std::string name = entry->d_name, path = folder + "/" + name;
+        struct stat info {};
+        if (name == "." || name == ".." || stat(path.c_str(), &info) != 0) continue;
+        parts.push_back(name);
+        if (S_ISDIR(info.st_mode)) FindMapFiles(path, parts, found);
+        else if (LowerCopy(name) == "actors.static") found.push_back(parts);
+        parts.pop_back();
+    }
+    closedir(dir);
+}
+
+std::string Joined(const std::vector<std::string>& parts, char separator) {
+    std::string path;
+    for (const std::string& part : parts) path += (path.empty() ? "" : std::string(1, separator)) + part;
+    return path;
+}
+
+bool NameSetPerMap(const BaselineInput& input) {
+    std::string maps = input.modsRoot + "/mapmods/maps";
+    std::vector<std::vector<std::string>> files;
+    std::vector<std::string> parts;
+    FindMapFiles(maps, parts, files);
+    auto upper = [](std::vector<std::string> path) {
+        for (std::string& part : path) std::transform(part.begin(), part.end(), part.begin(), ::toupper);
+        return path;
+    };
+    std::sort(files.begin(), files.end(), [&](const auto& a, const auto& b) { return upper(a) < upper(b); });
+    std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
+    if (!file) return false;
+    std::vector<std::string> names = SectionNamesByBracket(file);
+    std::fclose(file);
+    std::set<std::string> defined(names.begin(), names.end());
+
+    std::vector<std::string> lines, notMaps;
+    for (const std::vector<std::string>& path : files) {
+        std::string mapFile = maps + "/" + Joined(path, '/'), validation;
+        for (char c : FilePrefix(mapFile, 50000))
+            if (static_cast<unsigned char>(c) > 32) validation += c;
+        if (validation.find("com.maddox.il2.objects") == std::string::npos) {
+            notMaps.push_back("Not a map file: " + Joined(path, '\\'));
+            continue;
+        }
+        std::vector<std::string> missing;
+        for (const std::string& name : PlacedNames(mapFile))
+            if (!defined.count(name) && std::find(missing.begin(), missing.end(), name) == missing.end())
+                missing.push_back(name);
+        if (missing.empty()) continue;
+        lines.push_back("");
+        lines.push_back("Map: " + Joined(path, '\\'));
+        lines.insert(lines.end(), missing.begin(), missing.end());
+    }
+    if (lines.empty() && notMaps.empty()) return true;
+    Report report;
+    if (!OpenReport(input, "Missing_objects_all_maps.txt", report)) return false;
+    report.Line("Missing objects of all maps in your static.ini:");
+    if (!notMaps.empty()) lines.push_back("");
+    lines.insert(lines.end(), notMaps.begin(), notMaps.end());
+    for (const std::string& line : lines) report.Line(line);
+    std::fclose(report.file);
+    return true;
 }
 
 //--- rewriting: stream the catalogue through static.ini.tmp, once or twice
@@ -465,6 +547,7 @@ bool RunBaseline(const std::string& name, const BaselineInput& input) {
         {"mesh-index", SharedLiveDeadMeshes},
         {"open-per-mesh", OpenPerMeshPerFolder},
         {"linear-walk", LinearNameWalk},
+        {"name-set-per-map", NameSetPerMap},
         {"two-passes", RenumberPasses},
         {"one-pass", DenumberPass},
         {"entry-list", [](const BaselineInput& in) { return BuilderList(in, false); }},

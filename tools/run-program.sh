@@ -42,9 +42,14 @@ cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_TESTS=OFF >/dev
 cli="$top/build/release/src/verrant-cli"
 reports="$top/build/demo-reports"
 mkdir -p "$reports"
-for command in $("$cli" --help | sed -n 's/^  \([a-z+-]*\) .*/\1/p' | grep -v '^-'); do
-    echo "== verrant-cli $command"
-    "$cli" "$command" --catalogue "$catalogue" --map "$map" --report-dir "$reports"
+# Each command --help lists, with the option that picks it ("missing-objects --all-maps").
+"$cli" --help | sed -n 's/^  \([a-z][a-z+-]*\)\( --[a-z-]*\)\{0,1\} .*/\1\2/p' | while read -r command option; do
+    echo "== verrant-cli $command${option:+ $option}"
+    if [ -n "$option" ]; then
+        "$cli" "$command" "$option" --catalogue "$catalogue" --report-dir "$reports"
+    else
+        "$cli" "$command" --catalogue "$catalogue" --map "$map" --report-dir "$reports"
+    fi
     echo "   exit status $?"
 done
 echo "Reports in $reports"

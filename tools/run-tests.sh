@@ -9,7 +9,7 @@ jobs=$(nproc 2>/dev/null || echo 2)
 
 packages=(cmake make g++ libgtest-dev googletest g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64
           wine wine64 fonts-wine fonts-dejavu-core xvfb xauth imagemagick x11-utils
-          clang libclang-rt-14-dev)
+          clang libclang-rt-14-dev zip unzip)
 missing=()
 for package in "${packages[@]}"; do
     dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
@@ -83,8 +83,8 @@ else
     tail -n 30 "$logs/mingw-build.log"
 fi
 
-# Further suites print their own closing line.
-for suite in tests/e2e/run-e2e.sh tests/fuzz/run-fuzz.sh; do
+# Further suites print their own closing line; the package suite makes the download zip.
+for suite in tests/e2e/run-e2e.sh tests/package/run-package-test.sh tests/fuzz/run-fuzz.sh; do
     [ -f "$suite" ] || continue
     bash "$suite" >"$logs/$(basename "$suite" .sh).log" 2>&1
     add_counts "$logs/$(basename "$suite" .sh).log" "$suite"

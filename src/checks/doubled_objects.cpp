@@ -53,16 +53,22 @@ void ListObjectsAndDoubles(const std::vector<std::string_view>& names, const std
 
 CommandResult FindDoubledObjects(const std::string& catalogueFolder) {
     std::string catalogue;
+    int findings = 0;
     if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    return FindDoubledObjectsInCatalogue(catalogue, findings);
+}
+
+CommandResult FindDoubledObjectsInCatalogue(const std::string& catalogue, int& findings) {
     if (ProgressListOn) ClearProgressList();
     std::vector<std::string_view> names = BuildingSectionNames(catalogue);
     DrainPendingEvents();
     std::vector<DoubledObject> doubles = PairDoubledNames(names);
     if (ProgressListOn) ListObjectsAndDoubles(names, doubles);
 
-    std::vector<std::string> findings;
-    for (const DoubledObject& doubled : doubles) findings.push_back(DoubledObjectLine(doubled));
+    std::vector<std::string> lines;
+    for (const DoubledObject& doubled : doubles) lines.push_back(DoubledObjectLine(doubled));
+    findings = static_cast<int>(lines.size());
     return WriteFindingsReport({"Doubled_objects.txt", "Doubled objects in your static.ini:", "No doubled objects",
                                 "No doubled objects found in your static.ini"},
-                               findings);
+                               lines);
 }

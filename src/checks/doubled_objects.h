@@ -18,3 +18,5 @@ std::vector<DoubledObject> PairDoubledNames(const std::vector<std::string_view>&
 std::string DoubledObjectLine(const DoubledObject& doubled);
 
 CommandResult FindDoubledObjects(const std::string& catalogueFolder);
+// The same on the catalogue's bytes, read already; findings is the number of pairs.
+CommandResult FindDoubledObjectsInCatalogue(const std::string& catalogue, int& findings);

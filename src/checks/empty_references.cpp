@@ -31,9 +31,15 @@ std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
 }
 
 CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
-    const std::string nothingFound = "No empty references found in your static.ini";
     std::string catalogue;
+    int findings = 0;
     if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    return FindEmptyReferencesInCatalogue(catalogue, findings);
+}
+
+CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings) {
+    const std::string nothingFound = "No empty references found in your static.ini";
+    findings = 0;
     if (ProgressListOn) {
         ClearProgressList();
         AddProgressLine("Empty references in your Static.ini");
@@ -45,6 +51,7 @@ CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
     WriteReportLine(report, "");
 
     std::vector<EmptyReference> found = FindEmptyReferenceLines(catalogue);
+    findings = static_cast<int>(found.size());
     for (const EmptyReference& reference : found) {
         std::vector<std::string> lines = EmptyReferenceLines(reference);
         if (ProgressListOn) {

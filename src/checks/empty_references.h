@@ -20,3 +20,5 @@ std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference);
 
 // The report is written even when nothing is found; Findings when something was.
 CommandResult FindEmptyReferences(const std::string& catalogueFolder);
+// The same on the catalogue's bytes, read already; findings is the number of empty keys.
+CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings);

@@ -95,15 +95,21 @@ std::string IrregularEntryLine(const JudgedLine& entry) {
 
 CommandResult CheckIrregularEntries(const std::string& catalogueFolder) {
     std::string catalogue;
+    int findings = 0;
     if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    return CheckIrregularEntriesInCatalogue(catalogue, findings);
+}
+
+CommandResult CheckIrregularEntriesInCatalogue(const std::string& catalogue, int& findings) {
     if (ProgressListOn) ClearProgressList();
     std::vector<JudgedLine> judged = JudgeCatalogueLines(catalogue, ProgressListOn);
     if (ProgressListOn) ListJudgedLines(judged);
 
-    std::vector<std::string> findings;
+    std::vector<std::string> lines;
     for (const JudgedLine& entry : judged)
-        if (entry.prefix.empty()) findings.push_back(IrregularEntryLine(entry));
+        if (entry.prefix.empty()) lines.push_back(IrregularEntryLine(entry));
+    findings = static_cast<int>(lines.size());
     return WriteFindingsReport({"Irregular_entrys.txt", "Irregular entrys in your static.ini:", "No irregular objects",
                                 "No irregular objects found in your static.ini"},
-                               findings);
+                               lines);
 }

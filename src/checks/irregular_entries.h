@@ -21,3 +21,5 @@ std::vector<JudgedLine> JudgeCatalogueLines(const std::string& catalogue, bool k
 std::string IrregularEntryLine(const JudgedLine& entry);
 
 CommandResult CheckIrregularEntries(const std::string& catalogueFolder);
+// The same on the catalogue's bytes, read already; findings is the number of irregular lines.
+CommandResult CheckIrregularEntriesInCatalogue(const std::string& catalogue, int& findings);

@@ -189,18 +189,18 @@ std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue) {
 
 // One pass sorts the entries of standard groups by their title, in index order; the titles are then
 // excluded one after the other as before, without a walk over the whole index for each of the 42.
-void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index) {
-    if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "});
+void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add) {
+    if (ProgressListOn) AddLines({StepRuler, "Excluding Standard Titles", " "}, add);
     std::unordered_map<std::string_view, std::size_t> titlePlace;
     for (std::size_t t = 0; t < StandardTitles.size(); ++t) titlePlace.emplace(StandardTitles[t], t);
     std::vector<std::vector<MeshIndexEntry*>> byTitle(StandardTitles.size());
     for (MeshIndexEntry& entry : index)
         if (auto place = titlePlace.find(entry.title); place != titlePlace.end()) byTitle[place->second].push_back(&entry);
     for (std::size_t t = 0; t < StandardTitles.size(); ++t) {
-        if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "});
+        if (ProgressListOn) AddLines({StepRuler, "Excluding " + StandardTitles[t], " "}, add);
         DrainPendingEvents();
         for (MeshIndexEntry* entry : byTitle[t]) {
-            if (ProgressListOn) AddProgressLine("Excluding " + std::string(entry->sectionName));
+            if (ProgressListOn) add("Excluding " + std::string(entry->sectionName));
             entry->title = {};
         }
     }
@@ -234,35 +234,62 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
     return reported;
 }
 
-CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
-    const bool missingMode = check == MeshCheck::MissingMeshes;
-    Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
-    Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);
+namespace {
+
+struct MeshRun {
+    Handle waitWindow = 0;
+    Handle bar = 0;
+};
+
+MeshRun StartMeshRun() {
+    MeshRun run;
+    run.waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
+    run.bar = AddProgressBar(run.waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
         ClearProgressList();
         AddLines({StepRuler, "Building object index"});
     }
-    std::string catalogue;
-    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
-    if (read != FileRead::Whole) {
-        CloseTopWindow(waitWindow);
-        TellCatalogueFailure(read, CantOpenCatalogue);
-        return CommandResult::Failed;
+    return run;
+}
+
+int CountMeshFindings(const std::vector<MeshIndexEntry>& index, MeshCheck check) {
+    int findings = 0;
+    for (const MeshIndexEntry& entry : index) {
+        if (check == MeshCheck::SharedLiveDeadMeshes) {
+            findings += SharesLiveDeadMesh(entry);
+        } else if (!entry.title.empty()) {
+            for (const MeshSlot& slot : MeshSlots) findings += IsMissing(entry.*slot.value, entry.*slot.found);
+        }
     }
-    std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
-    ExcludeStandardTitles(index);
+    return findings;
+}
+
+CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogue, const std::string& modsRoot,
+                            MeshCheck check, SharedMeshIndex& shared, int& findings) {
+    const bool missingMode = check == MeshCheck::MissingMeshes;
+    if (!shared.made) {
+        shared.entries = BuildMeshIndex(catalogue);
+        ExcludeStandardTitles(shared.entries, [&shared](const std::string& line) {
+            AddProgressLine(line);
+            shared.progressLines.push_back(line);
+        });
+        shared.made = true;
+    } else if (ProgressListOn) {
+        for (const std::string& line : shared.progressLines) AddProgressLine(line);
+    }
+    std::vector<MeshIndexEntry>& index = shared.entries;
     if (ProgressListOn) {
         DrainPendingEvents();
         AddLines({" ", StepRuler, "Searching folders & files", " "});
         DrainPendingEvents();
     }
     if (missingMode) {
-        SearchModMeshFolders(index, modsRoot, bar);
+        SearchModMeshFolders(index, modsRoot, run.bar);
         if (ProgressListOn) ReportMissingMeshes(index, MeshOutput::ProgressList, AddProgressLine);
     } else if (ProgressListOn) {
         ReportSharedLiveDeadMeshes(index, MeshOutput::ProgressList, AddProgressLine);
     }
-    CloseTopWindow(waitWindow);
+    CloseTopWindow(run.waitWindow);
 
     ReportFile report;
     if (!CreateReport(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report))
@@ -277,6 +304,29 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
     LineSink toReport = [&report](const std::string& line) { WriteReportLine(report, line); };
     bool reported = missingMode ? ReportMissingMeshes(index, MeshOutput::ReportBody, toReport)
                                 : ReportSharedLiveDeadMeshes(index, MeshOutput::ReportBody, toReport);
+    findings = CountMeshFindings(index, check);
     if (!FinishReport(report)) return CommandResult::Failed;
     return reported ? CommandResult::Findings : CommandResult::NothingFound;
+}
+
+}  // namespace
+
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
+    MeshRun run = StartMeshRun();
+    std::string catalogue;
+    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
+    if (read != FileRead::Whole) {
+        CloseTopWindow(run.waitWindow);
+        TellCatalogueFailure(read, CantOpenCatalogue);
+        return CommandResult::Failed;
+    }
+    int findings = 0;
+    SharedMeshIndex index;
+    return FinishMeshRun(run, catalogue, modsRoot, check, index, findings);
+}
+
+CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
+                                             SharedMeshIndex& index, int& findings) {
+    findings = 0;
+    return FinishMeshRun(StartMeshRun(), catalogue, modsRoot, check, index, findings);
 }

@@ -4,6 +4,7 @@
 #pragma once
 
 #include "output/command_result.h"
+#include "output/progress_list.h"
 
 #include <functional>
 #include <string>
@@ -36,15 +37,17 @@ extern const std::vector<std::string> StandardTitles;
 // in the line's own case, with "/" turned into "\". False when the line holds no "3do".
 bool CutMeshValue(std::string_view line, std::string& value);
 
+using LineSink = std::function<void(const std::string&)>;
+
 // One entry per building header after the first group marker; its views point into the catalogue.
 std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue);
 // Empties the title of every entry in a standard title group; later steps pass over such entries.
-void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index);
+// While the progress list is on, the steps go to the sink.
+void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add = AddProgressLine);
 
 // Where a mode's findings go: the progress list or the report's body. Each gives its lines to the
 // sink and returns the reported flag.
 enum class MeshOutput { ProgressList, ReportBody };
-using LineSink = std::function<void(const std::string&)>;
 bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add);
 bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
                                 const LineSink& add);
@@ -52,3 +55,14 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
 enum class MeshCheck { MissingMeshes, SharedLiveDeadMeshes };
 // The whole run of one of the two checks; modsRoot ends in "\". Always writes and opens its report.
 CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check);
+// The index of one catalogue, made by the first check that needs it and kept for the other: neither
+// check reads what the other changes (the missing check sets found flags only).
+struct SharedMeshIndex {
+    bool made = false;
+    std::vector<MeshIndexEntry> entries;
+    std::vector<std::string> progressLines;  // making it gave these; the second check shows them again
+};
+// The same on the catalogue's bytes, read already; findings is the number of missing meshes, or of
+// entries whose live and dead meshes are one file.
+CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
+                                             SharedMeshIndex& index, int& findings);

@@ -4,7 +4,9 @@
 // be read or written.
 #include "cli/cli_missing_objects.h"
 #include "cli/cli_options.h"
+#include "cli/cli_tree.h"
 #include "commands/command_table.h"
+#include "location/derived_paths.h"
 #include "output/app_state.h"
 #include "output/progress_list.h"
 #include "platform/headless/headless.h"
@@ -14,20 +16,34 @@
 namespace {
 
 const int ExitNothingFound = 0, ExitFindings = 1, ExitTrouble = 2;
+// The desktop program's version, as its title and version resource give it.
+const char* const Version = "1.3";
 
 void PrintHelp(std::FILE* to) {
     std::fprintf(to,
-                 "usage: verrant-cli COMMAND --catalogue DIR [--report-dir DIR] [--progress]\n"
+                 "usage: verrant-cli COMMAND (--catalogue DIR | --tree DIR) [--report-dir DIR] [--progress]\n"
+                 "       verrant-cli --help | --version\n"
                  "  --catalogue DIR   the folder that holds static.ini\n"
+                 "  --tree DIR        the game folder, its mods folder or any folder inside the tree: static.ini\n"
+                 "                    is looked for in mods\\std\\com\\maddox\\il2\\objects\\ there or above\n"
                  "  --report-dir DIR  where the report is written (default: the current folder)\n"
                  "  --progress        print the progress list's lines to standard output\n"
-                 "  --map FILE        missing-objects: the map file; without --catalogue, its tree's catalogue\n"
+                 "  --map FILE        missing-objects: the map file; without --catalogue or --tree, its tree's\n"
+                 "                    catalogue\n"
+                 "  --all-maps        missing-objects: every map of the tree instead of one\n"
                  "commands:\n");
-    for (const Command& command : Commands)
-        if (command.cliName) std::fprintf(to, "  %-22s %s\n", command.cliName, command.summary);
+    for (const Command& command : Commands) {
+        if (!command.cliName) continue;
+        std::string name = command.cliName;
+        if (command.cliOption) name = name + " " + command.cliOption;
+        std::fprintf(to, "  %-27s %s\n", name.c_str(), command.summary);
+    }
     std::fprintf(to, "exit status: 0 nothing found, catalogue rewritten or list written; 1 findings reported;\n"
-                     "  2 bad usage, or a catalogue, report or list that could not be read or written\n");
+                     "  2 bad usage, or a catalogue, maps folder, report or list that could not be read or written\n"
+                     "  (check-all: 2 when any check could not run, else 1 when any found something)\n");
 }
+
+void PrintSummaryLine(const std::string& line) { std::printf("%s\n", line.c_str()); }
 
 // The program's own form of a host folder: absolute, "\" separators, ending in "\".
 std::string ProgramFolder(const std::string& hostFolder) {
@@ -50,16 +66,25 @@ int main(int argc, char** argv) {
         PrintHelp(stdout);
         return ExitNothingFound;
     }
-    const Command* chosen = CommandNamed(options.command);
+    if (options.version) {
+        std::printf("verrant-cli %s\n", Version);
+        return ExitNothingFound;
+    }
+    const Command* chosen = CommandNamed(options.command, options.allMaps ? "--all-maps" : "");
     if (!chosen) {
-        std::fprintf(stderr, "verrant-cli: unknown command %s\n", options.command.c_str());
+        std::fprintf(stderr, "verrant-cli: unknown command %s%s\n", options.command.c_str(),
+                     options.allMaps ? " --all-maps" : "");
         PrintHelp(stderr);
         return ExitTrouble;
     }
 
     ClearAppState();
     StartFolder = ProgramFolder(".");
-    if (!options.catalogue.empty()) CatalogueFolder = ProgramFolder(options.catalogue);
+    if (!options.catalogue.empty()) {
+        CatalogueFolder = ProgramFolder(options.catalogue);
+        MapsPattern = DeriveMapsPattern(CatalogueFolder);
+    }
+    if (!options.tree.empty() && !UseTreeCatalogue(ProgramFolder(options.tree))) return ExitTrouble;
     std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
     // Through the file layer, so that the folder's name matches as the catalogue's does.
     if (!MakeFolderCurrent(ProgramFolder(reportDir))) {
@@ -75,14 +100,15 @@ int main(int argc, char** argv) {
 
     std::string mapSelection;
     if (chosen->takesMap && !PrepareMapCheck(options, mapSelection)) return ExitTrouble;
-    CommandResult result = RunCommand(*chosen, mapSelection);
+    if (chosen->takesMapsFolder && !CatalogueFolder.empty()) TellMissingMapsFolder();
+    CommandResult result = RunCommand(*chosen, mapSelection, PrintSummaryLine);
     std::fflush(stdout);
     switch (result) {
         case CommandResult::NothingFound: return ExitNothingFound;
         case CommandResult::Done: return ExitNothingFound;
         case CommandResult::Findings: return ExitFindings;
         case CommandResult::NoFolder:
-            std::fprintf(stderr, "verrant-cli: no catalogue folder: give --catalogue DIR\n");
+            std::fprintf(stderr, "verrant-cli: no catalogue folder: give --catalogue DIR or --tree DIR\n");
             return ExitTrouble;
         case CommandResult::Failed: return ExitTrouble;
     }

@@ -2,6 +2,7 @@
 
 bool ParseCliOptions(const std::vector<std::string>& words, CliOptions& options, std::string& error) {
     options = CliOptions();
+    error.clear();
     for (std::size_t i = 0; i < words.size(); ++i) {
         const std::string& word = words[i];
         auto value = [&](std::string& into) {
@@ -14,8 +15,14 @@ bool ParseCliOptions(const std::vector<std::string>& words, CliOptions& options,
         };
         if (word == "--help" || word == "-h") {
             options.help = true;
+        } else if (word == "--version") {
+            options.version = true;
         } else if (word == "--progress") {
             options.progress = true;
+        } else if (word == "--all-maps") {
+            options.allMaps = true;
+        } else if (word == "--tree") {
+            if (!value(options.tree)) return false;
         } else if (word == "--catalogue") {
             if (!value(options.catalogue)) return false;
         } else if (word == "--report-dir") {
@@ -32,9 +39,12 @@ bool ParseCliOptions(const std::vector<std::string>& words, CliOptions& options,
             return false;
         }
     }
-    if (!options.help && options.command.empty()) {
+    if (options.help || options.version) return true;
+    if (options.command.empty())
         error = "no command given";
-        return false;
-    }
-    return true;
+    else if (!options.tree.empty() && !options.catalogue.empty())
+        error = "give --tree or --catalogue, not both";
+    else if (options.allMaps && !options.map.empty())
+        error = "give --map or --all-maps, not both";
+    return error.empty();
 }

@@ -4,9 +4,11 @@
 #include "checks/empty_references.h"
 #include "checks/irregular_entries.h"
 #include "checks/mesh_references.h"
+#include "commands/check_all.h"
 #include "location/catalogue_folder.h"
 #include "location/derived_paths.h"
 #include "location/settings.h"
+#include "maps/all_maps.h"
 #include "maps/missing_map_objects.h"
 #include "maps/missing_objects_window.h"
 #include "output/app_state.h"
@@ -20,6 +22,13 @@ CommandResult CheckMissingObjects(const CommandInput& input) {
     if (!input.mapSelection.empty()) return FindMissingMapObjects(input.mapSelection, input.catalogueFolder);
     ShowMissingObjectsWindow(input.mapsPattern);
     return CommandResult::NothingFound;
+}
+
+CommandResult CheckMissingObjectsOfAllMaps(const CommandInput& input) {
+    AllMapsCount count;
+    CommandResult result = CheckAllMaps(input.catalogueFolder, input.mapsFolder, count);
+    if (result != CommandResult::Failed && input.summary) input.summary(AllMapsSummary(count));
+    return result;
 }
 
 const Command CommandRows[] = {
@@ -40,6 +49,8 @@ const Command CommandRows[] = {
     // The menu item opens the window in which maps are picked; verrant-cli names the map.
     {MenuMissingObjects, "missing-objects", "objects a map (--map FILE) places that the catalogue lacks", false, true,
      CheckMissingObjects},
+    {0, "missing-objects", "every actors.static under mods\\mapmods\\maps\\ (Missing_objects_all_maps.txt)", true,
+     false, CheckMissingObjectsOfAllMaps, "--all-maps", true},
     {MenuWrongSimReferences, "wrong-sim-references", "mesh files that no 3do folder of a mod holds", true, false,
      [](const CommandInput& in) {
          return CheckMeshReferences(in.catalogueFolder, in.modsRoot, MeshCheck::MissingMeshes);
@@ -48,6 +59,8 @@ const Command CommandRows[] = {
      [](const CommandInput& in) {
          return CheckMeshReferences(in.catalogueFolder, in.modsRoot, MeshCheck::SharedLiveDeadMeshes);
      }},
+    {0, "check-all", "the five catalogue checks and every map, one line each; rewrites nothing", true, false,
+     CheckAll, nullptr, true},
     {MenuSavePath, nullptr, "saves the catalogue folder in verrant.ini", true, false,
      [](const CommandInput& in) {
          return SavePath(in.catalogueFolder, in.startFolder) ? CommandResult::Done : CommandResult::Failed;
@@ -68,24 +81,29 @@ const Command CommandRows[] = {
 const std::span<const Command> Commands = CommandRows;
 
 const Command* CommandWithId(int id) {
+    if (id == 0) return nullptr;
     for (const Command& command : Commands)
         if (command.id == id) return &command;
     return nullptr;
 }
 
-const Command* CommandNamed(std::string_view cliName) {
+const Command* CommandNamed(std::string_view cliName, std::string_view cliOption) {
     for (const Command& command : Commands)
-        if (command.cliName && cliName == command.cliName) return &command;
+        if (command.cliName && cliName == command.cliName && cliOption == (command.cliOption ? command.cliOption : ""))
+            return &command;
     return nullptr;
 }
 
-CommandResult RunCommand(const Command& command, const std::string& mapSelection) {
+CommandResult RunCommand(const Command& command, const std::string& mapSelection,
+                         const std::function<void(const std::string&)>& summary) {
     if (command.needsCatalogueFolder && !EnsureCatalogueFolder()) return CommandResult::NoFolder;
     CommandInput input;
     input.catalogueFolder = CatalogueFolder;
     input.modsRoot = DeriveModsRoot(CatalogueFolder);
     input.mapsPattern = MapsPattern;
+    input.mapsFolder = MapsPattern.substr(0, MapsPattern.rfind('\\') + 1);
     input.mapSelection = mapSelection;
     input.startFolder = StartFolder;
+    input.summary = summary;
     return command.run(input);
 }

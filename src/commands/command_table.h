@@ -5,6 +5,7 @@
 
 #include "output/command_result.h"
 
+#include <functional>
 #include <span>
 #include <string>
 #include <string_view>
@@ -34,8 +35,12 @@ struct CommandInput {
     std::string catalogueFolder;  // holds static.ini, ends in "\"
     std::string modsRoot;         // the catalogue folder cut at its first "mods", ending in "\"
     std::string mapsPattern;      // where the missing objects window opens
+    std::string mapsFolder;       // the same without its "*.*": where every map is looked for
     std::string mapSelection;     // "folder\*file" of the map to check; "" opens the window instead
     std::string startFolder;      // holds verrant.ini
+    // verrant-cli's own lines on standard output, such as a command's summary; none in the desktop
+    // program, whose commands speak through reports and message boxes only.
+    std::function<void(const std::string&)> summary;
 };
 
 struct Command {
@@ -45,12 +50,15 @@ struct Command {
     bool needsCatalogueFolder = false;
     bool takesMap = false;          // checks the map of CommandInput::mapSelection
     CommandResult (*run)(const CommandInput&) = nullptr;
+    const char* cliOption = nullptr;  // the option that picks this row over the row of the same name
+    bool takesMapsFolder = false;     // checks every map under CommandInput::mapsFolder
 };
 
 extern const std::span<const Command> Commands;
 
-// nullptr when no command has that id or name.
+// nullptr when no command has that id (0 is none), or that name and option ("" for none).
 const Command* CommandWithId(int id);
-const Command* CommandNamed(std::string_view cliName);
+const Command* CommandNamed(std::string_view cliName, std::string_view cliOption = "");
 // Asks for the catalogue folder first when the command needs one and none is known; then runs it.
-CommandResult RunCommand(const Command& command, const std::string& mapSelection = "");
+CommandResult RunCommand(const Command& command, const std::string& mapSelection = "",
+                         const std::function<void(const std::string&)>& summary = {});
