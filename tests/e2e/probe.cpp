@@ -16,13 +16,12 @@ void DescribeMenu(HMENU menu, const std::string& indent, std::string& out) {
     for (int i = 0; i < GetMenuItemCount(menu); ++i) {
         char text[256] = "";
         MENUITEMINFOA item = {.cbSize = sizeof item,
-                              .fMask = MIIM_FTYPE | MIIM_ID | MIIM_SUBMENU | MIIM_STRING,
-                              .dwTypeData = text,
-                              .cch = sizeof text};
+                              .fMask = MIIM_FTYPE | MIIM_ID | MIIM_SUBMENU | MIIM_STRING};
+        item.dwTypeData = text;
+        item.cch = sizeof text;
         GetMenuItemInfoA(menu, static_cast<UINT>(i), TRUE, &item);
-        bool command = !item.hSubMenu && !(item.fType & MFT_SEPARATOR);
-        out.append("\n").append(indent).append(item.fType & MFT_SEPARATOR ? "-" : "");
-        out.append(command ? std::to_string(item.wID) + " " : "").append(text);
+        bool rule = item.fType & MFT_SEPARATOR;
+        out += "\n" + indent + (rule ? "-" : item.hSubMenu ? "" : std::to_string(item.wID) + " ") + text;
         if (item.hSubMenu) DescribeMenu(item.hSubMenu, indent + "  ", out);
     }
 }
@@ -58,8 +57,7 @@ std::string Layout(HWND window) {
         LVCOLUMNA column = {.mask = LVCF_TEXT, .pszText = face, .cchTextMax = sizeof face};
         for (WPARAM c = 0; SendMessageA(child, LVM_GETCOLUMNA, c, reinterpret_cast<LPARAM>(&column)); ++c)
             out.append(c ? "," : " columns ").append(face);
-        // A caption must fit between two pixels of border on each side, in a font other than the bold
-        // system font.
+        // A caption must fit within two pixels of border a side, in a font other than the bold system one.
         HDC dc = GetDC(child);  // drawing in the system font unless the control has a font of its own
         SelectObject(dc, reinterpret_cast<HFONT>(SendMessageA(child, WM_GETFONT, 0, 0)));
         SIZE size = {};

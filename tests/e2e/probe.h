@@ -1,14 +1,13 @@
-// The protocol between the end-to-end driver and its probe, a hook DLL in the program's thread:
-// another process cannot read a menu under Wine, nor hand a list view pointers, nor measure text in
-// the program's fonts. The driver posts the request message to a window of the program; the probe
-// answers into the file, in the work folder that run-e2e.sh makes.
+// The protocol between the end-to-end driver and its probe, a hook DLL in the program's thread: another
+// process cannot read a menu under Wine, nor hand a list view pointers, nor measure text in the program's
+// fonts. The driver posts a request to a window of the program; the probe answers into the file.
 #pragma once
 
 #define PROBE_MESSAGE_NAME "VerrantE2EProbeRequest"
-#define PROBE_ANSWER_FILE "C:\\verrant-e2e\\probe-answer.txt"
+#define E2E_WORK_FOLDER "C:\\verrant-e2e\\"  // made by run-e2e.sh
+#define PROBE_ANSWER_FILE E2E_WORK_FOLDER "probe-answer.txt"
 
-// wParam of the request; lParam is the row of the window's list view where one is needed.
-enum ProbeRequest {
+enum ProbeRequest {       // in wParam; lParam is the row of the window's list view where one is needed
     ProbeLayout = 1,      // place, client size, frame; each child: class, text, place, traits, faults; menu
     ProbeRows,            // the name of each row of the window's list view, or each line of its list box
     ProbeSelectRow,       // selects and focuses a row, as a click would
