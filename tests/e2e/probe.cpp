@@ -11,18 +11,17 @@
 
 namespace {
 
+// Each item on a line of its own, indented by its depth: "ID TEXT", a sub-menu's TEXT, or "-".
 void DescribeMenu(HMENU menu, const std::string& indent, std::string& out) {
     for (int i = 0; i < GetMenuItemCount(menu); ++i) {
         char text[256] = "";
-        MENUITEMINFOA item = {};
-        item.cbSize = sizeof item;
-        item.fMask = MIIM_FTYPE | MIIM_ID | MIIM_STATE | MIIM_SUBMENU | MIIM_STRING;
+        MENUITEMINFOA item = {.cbSize = sizeof item,
+                              .fMask = MIIM_FTYPE | MIIM_ID | MIIM_SUBMENU | MIIM_STRING};
         item.dwTypeData = text;
         item.cch = sizeof text;
         GetMenuItemInfoA(menu, static_cast<UINT>(i), TRUE, &item);
-        bool command = !item.hSubMenu && !(item.fType & MFT_SEPARATOR);
-        out.append(indent).append(item.fType & MFT_SEPARATOR ? "-" : "");
-        out.append(command ? std::to_string(item.wID) + " " : "").append(text).append("\n");
+        bool rule = item.fType & MFT_SEPARATOR;
+        out += "\n" + indent + (rule ? "-" : item.hSubMenu ? "" : std::to_string(item.wID) + " ") + text;
         if (item.hSubMenu) DescribeMenu(item.hSubMenu, indent + "  ", out);
     }
 }
@@ -38,8 +37,7 @@ std::string Layout(HWND window) {
     RECT box, frame = {};
     GetWindowRect(window, &box);
     LONG style = GetWindowLongA(window, GWL_STYLE);
-    AdjustWindowRectEx(&frame, static_cast<DWORD>(style), FALSE,
-                       static_cast<DWORD>(GetWindowLongA(window, GWL_EXSTYLE)));
+    AdjustWindowRectEx(&frame, style, FALSE, GetWindowLongA(window, GWL_EXSTYLE));
     std::string out = Place(box, {frame.right - frame.left, frame.bottom - frame.top});
     const LONG bits[] = {WS_CAPTION, WS_SYSMENU, WS_THICKFRAME, WS_MINIMIZEBOX, WS_MAXIMIZEBOX};
     const char* traits[] = {" caption", " sysmenu", " sizing", " minbox", " maxbox"};
@@ -56,17 +54,12 @@ std::string Layout(HWND window) {
         if (GetWindowLongA(child, GWL_EXSTYLE) & WS_EX_CLIENTEDGE) out += " sunken";
         style = GetWindowLongA(child, GWL_STYLE) & (BS_PUSHLIKE | BS_TYPEMASK);
         if (lstrcmpA(name, "Button") == 0 && style == (BS_PUSHLIKE | BS_AUTOCHECKBOX)) out += " toggle";
-        LVCOLUMNA column = {};
-        column.mask = LVCF_TEXT;
-        column.pszText = face;
-        column.cchTextMax = sizeof face;
+        LVCOLUMNA column = {.mask = LVCF_TEXT, .pszText = face, .cchTextMax = sizeof face};
         for (WPARAM c = 0; SendMessageA(child, LVM_GETCOLUMNA, c, reinterpret_cast<LPARAM>(&column)); ++c)
             out.append(c ? "," : " columns ").append(face);
-        // A caption must fit between two pixels of border on each side, in a font other than the bold
-        // system font.
-        auto font = reinterpret_cast<HFONT>(SendMessageA(child, WM_GETFONT, 0, 0));
-        HDC dc = GetDC(child);  // drawing in the system font unless a font is selected into it
-        if (font) SelectObject(dc, font);
+        // A caption must fit within two pixels of border a side, in a font other than the bold system one.
+        HDC dc = GetDC(child);  // drawing in the system font unless the control has a font of its own
+        SelectObject(dc, reinterpret_cast<HFONT>(SendMessageA(child, WM_GETFONT, 0, 0)));
         SIZE size = {};
         GetTextExtentPoint32A(dc, text, lstrlenA(text), &size);
         GetTextFaceA(dc, sizeof face, face);
@@ -74,44 +67,36 @@ std::string Layout(HWND window) {
         if (text[0] && lstrcmpA(face, "System") == 0) out += " SYSTEM-FONT";
         if (size.cx + 4 > box.right - box.left) out += " TOO-NARROW:" + std::to_string(size.cx);
     }
+    DescribeMenu(GetMenu(window), "", out);  // none on a window without a menu
     return out + "\n";
 }
 
-std::string Rows(HWND list) {
+// The rows of the window's list view, or the lines of its list box.
+std::string Rows(HWND window) {
+    HWND list = FindWindowExA(window, nullptr, WC_LISTVIEWA, nullptr);
+    HWND box = FindWindowExA(window, nullptr, "ListBox", nullptr);
     std::string out;
-    char text[512] = "";
-    LVITEMA cell = {};
-    cell.pszText = text;
-    cell.cchTextMax = sizeof text;
-    for (WPARAM r = 0; r < static_cast<WPARAM>(SendMessageA(list, LVM_GETITEMCOUNT, 0, 0)); ++r) {
-        SendMessageA(list, LVM_GETITEMTEXTA, r, reinterpret_cast<LPARAM>(&cell));
+    char text[4096] = "";
+    for (int row = 0; row < ListView_GetItemCount(list); ++row) {
+        ListView_GetItemText(list, row, 0, text, sizeof text);
         out.append(text).append("\n");
     }
+    for (LRESULT line = 0; line < SendMessageA(box, LB_GETCOUNT, 0, 0); ++line)
+        out.append(text, SendMessageA(box, LB_GETTEXT, line, reinterpret_cast<LPARAM>(text))).append("\n");
     return out;
 }
 
-void UseRow(HWND list, WPARAM row, WPARAM how) {
+void UseRow(HWND window, LPARAM row, WPARAM how) {
+    HWND list = FindWindowExA(window, nullptr, WC_LISTVIEWA, nullptr);
     SetFocus(list);
-    LVITEMA state = {};
-    state.stateMask = state.state = LVIS_SELECTED | LVIS_FOCUSED;
-    SendMessageA(list, LVM_SETITEMSTATE, row, reinterpret_cast<LPARAM>(&state));
-    SendMessageA(list, LVM_ENSUREVISIBLE, row, FALSE);
-    RECT cell = {LVIR_LABEL, 0, 0, 0};
-    SendMessageA(list, LVM_GETITEMRECT, row, reinterpret_cast<LPARAM>(&cell));
+    ListView_SetItemState(list, row, LVIS_SELECTED | LVIS_FOCUSED, LVIS_SELECTED | LVIS_FOCUSED);
+    ListView_EnsureVisible(list, row, FALSE);
+    RECT cell = {};
+    ListView_GetItemRect(list, row, &cell, LVIR_LABEL);
     LPARAM middle = MAKELPARAM((cell.left + cell.right) / 2, (cell.top + cell.bottom) / 2);
     if (how == ProbeEnterRow) PostMessageA(list, WM_KEYDOWN, VK_RETURN, 0x001C0001);
     if (how == ProbeDoubleClickRow) PostMessageA(list, WM_LBUTTONDBLCLK, MK_LBUTTON, middle);
     if (how == ProbeDoubleClickRow) PostMessageA(list, WM_LBUTTONUP, 0, middle);
-}
-
-std::string AnswerFor(HWND window, WPARAM request, WPARAM row) {
-    HWND list = FindWindowExA(window, nullptr, WC_LISTVIEWA, nullptr);
-    std::string out;
-    if (request == ProbeMenu) DescribeMenu(GetMenu(window), "", out);
-    if (request == ProbeLayout) out = Layout(window);
-    if (request == ProbeRows) out = Rows(list);
-    if (request >= ProbeSelectRow) UseRow(list, row, request);
-    return out;
 }
 
 }  // namespace
@@ -120,12 +105,11 @@ extern "C" __declspec(dllexport) LRESULT CALLBACK ProbeHook(int code, WPARAM wPa
     static const UINT request = RegisterWindowMessageA(PROBE_MESSAGE_NAME);
     auto* message = reinterpret_cast<MSG*>(lParam);
     if (code == HC_ACTION && wParam == PM_REMOVE && message->message == request) {
-        char path[MAX_PATH] = "";
-        GetEnvironmentVariableA(PROBE_FILE_VARIABLE, path, sizeof path);
+        if (message->wParam >= ProbeSelectRow) UseRow(message->hwnd, message->lParam, message->wParam);
         // Written aside and renamed, so the driver never reads half an answer.
-        std::ofstream(std::string(path) + ".part", std::ios::binary)
-            << AnswerFor(message->hwnd, message->wParam, static_cast<WPARAM>(message->lParam));
-        MoveFileExA((std::string(path) + ".part").c_str(), path, MOVEFILE_REPLACE_EXISTING);
+        std::ofstream(PROBE_ANSWER_FILE ".part", std::ios::binary)
+            << (message->wParam == ProbeLayout ? Layout(message->hwnd) : Rows(message->hwnd));
+        MoveFileExA(PROBE_ANSWER_FILE ".part", PROBE_ANSWER_FILE, MOVEFILE_REPLACE_EXISTING);
         message->message = WM_NULL;
     }
     return CallNextHookEx(nullptr, code, wParam, lParam);
