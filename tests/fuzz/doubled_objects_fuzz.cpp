@@ -2,8 +2,15 @@
 #include "fuzz_support.h"
 
 #include "checks/doubled_objects.h"
+#include "output/app_state.h"
+
+namespace {
+
+CommandResult FindInScratchCatalogue() { return FindDoubledObjects(CatalogueFolder); }
+
+}  // namespace
 
 extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size) {
-    RunCheckAgainstBaseline(data, size, FindDoubledObjects, "Doubled_objects.txt", "pairwise", true);
+    RunCheckAgainstBaseline(data, size, FindInScratchCatalogue, "Doubled_objects.txt", "pairwise", true);
     return 0;
 }

@@ -111,13 +111,10 @@ void Require(bool holds, const char* what) {
 }
 
 std::vector<std::string> CatalogueLinesOf(const std::string& bytes, bool trimmed) {
-    WriteScratchFile("static.ini", bytes);
-    CatalogueReader reader;
     std::vector<std::string> lines;
-    Require(OpenCatalogue(ScratchFolder(), reader), "the scratch catalogue opens");
-    std::string line;
-    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.push_back(line);
-    CloseCatalogue(reader);
+    LineReader reader = LinesOf(bytes);
+    std::string_view line;
+    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.emplace_back(line);
     return lines;
 }
 

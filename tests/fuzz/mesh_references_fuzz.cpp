@@ -37,7 +37,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     ProgressListOn = size > 0 && (data[0] & 1);
     if (ProgressListOn) OpenProgressList();
 
-    CommandResult doubled = CheckMeshReferences(ScratchFolder() + "mods\\", "doubled");
+    CommandResult doubled = CheckMeshReferences(CatalogueFolder, ScratchFolder() + "mods\\", MeshCheck::SharedLiveDeadMeshes);
     bool written = false, expected = false;
     std::string report = ReadDesktopFile("Doubled_sims_or_meshes.txt", written);
     Require(written && report == BaselineOutput("mesh-index", "Doubled_sims_or_meshes.txt", expected),
@@ -45,7 +45,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     Require((doubled == CommandResult::Findings) == (report.find("\r\nMeshLive: ") != std::string::npos),
             "the doubled result");
 
-    CheckMeshReferences(ScratchFolder() + "mods\\", "missing");
+    CheckMeshReferences(CatalogueFolder, ScratchFolder() + "mods\\", MeshCheck::MissingMeshes);
     std::istringstream lines(ReadDesktopFile("Missing_3do.txt", written));
     Require(written, "the missing report is written");
     for (std::string line; std::getline(lines, line);) {

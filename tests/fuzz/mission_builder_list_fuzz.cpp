@@ -7,8 +7,10 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     ResetForInput();
     WriteScratchFile("static.ini", std::string(reinterpret_cast<const char*>(data), size));
     const struct {
-        const char *mode, *file, *baseline;
-    } modes[] = {{"fmb", "Static_list_FMB.txt", "entry-list"}, {"fmb+", "Static_list_FMBplus.txt", "entry-list-plus"}};
+        BuilderList mode;
+        const char *file, *baseline;
+    } modes[] = {{BuilderList::Fmb, "Static_list_FMB.txt", "entry-list"},
+                 {BuilderList::FmbPlus, "Static_list_FMBplus.txt", "entry-list-plus"}};
     for (const auto& mode : modes) {
         Require(CreateMissionBuilderList(ScratchFolder(), mode.mode) == CommandResult::Done, "the list is written");
         bool written = false, expected = false;

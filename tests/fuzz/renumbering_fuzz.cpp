@@ -16,7 +16,7 @@ bool NumberLineOracle(const std::string& line) {
     return true;
 }
 
-std::string Rewrite(const char* mode) {
+std::string Rewrite(Numbering mode) {
     Require(RenumberCatalogue(ScratchFolder(), mode) == CommandResult::Done, "the rewrite is done");
     bool exists = false, leftOver = false;
     std::string catalogue = ReadScratchFile("static.ini", exists);
@@ -39,13 +39,13 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     }
 
     WriteScratchFile("static.ini", input);
-    std::string renumbered = Rewrite("renumber");
+    std::string renumbered = Rewrite(Numbering::Renumber);
     if (onlyNumberLinesHoldBrackets) {
         WriteScratchFile("copy/static.ini", input);
         bool exists = false;
         Require(renumbered == BaselineOutput("two-passes", "@static.ini", exists), "renumbering as the two passes");
     }
-    Require(Rewrite("renumber") == renumbered, "a second renumbering changes nothing");
-    Require(Rewrite("denumber") == CrLfText(kept), "denumbering gives back every line but the number lines");
+    Require(Rewrite(Numbering::Renumber) == renumbered, "a second renumbering changes nothing");
+    Require(Rewrite(Numbering::Denumber) == CrLfText(kept), "denumbering gives back every line but the number lines");
     return 0;
 }
