@@ -1,18 +1,26 @@
 // Files and folders on the host's file system. Program paths use "\" and are turned into host
-// paths here. Names are matched as Windows matches them: a path component with no exact match
-// takes the entry whose name is the same without regard to ASCII letter case.
+// paths here, read as Windows reads them: "." and ".." by their text, not on the disk, and a path
+// component with no exact match takes the entry whose name is the same without regard to ASCII
+// letter case.
 #include "platform/headless/headless.h"
 
+#include <fcntl.h>
 #include <sys/stat.h>
 
 #include <algorithm>
+#include <cerrno>
 #include <cstdio>
 #include <filesystem>
 #include <map>
+#include <string_view>
 #include <system_error>
+#include <unordered_map>
 #ifdef _WIN32
 #include <io.h>
+#include <share.h>
+#include <sys/locking.h>
 #else
+#include <sys/file.h>
 #include <unistd.h>
 #endif
 
@@ -23,25 +31,51 @@ namespace {
 struct OpenFile {
     std::FILE* stream = nullptr;
     std::string bareName;
+    std::string hostPath;
     long long written = 0;
     long long read = 0;
     bool readFailed = false;
 };
 
+// A file taken for a rewrite, held open and locked while the claim lasts.
+struct ClaimedFile {
+    int descriptor = -1;
+    std::string target;  // host path of the file itself, links followed
+    struct stat status {};
+};
+
+// The names in a folder by their lowered form, as listed after the folder's last change.
+struct FolderNames {
+    fs::file_time_type changed;
+    std::unordered_map<std::string, std::string> byLowered;  // the first in the Windows order wins
+};
+
 std::map<Handle, OpenFile> Files;
+std::map<Handle, ClaimedFile> Claims;
 Handle LastFileHandle = 0;
 std::string Current;  // program path of the current folder, no trailing "\"
 HeadlessFileFaults Faults;
 HeadlessFileCounters Counters;
+std::unordered_map<std::string, FolderNames> CaseListings;  // host folder -> its names
+std::string LastFailure;  // "host path: reason" when the latest file operation failed
+const char* const InjectedFault = "fault injected";
+const char* const NotPlainFile = "not a plain file";
+const char* const ReadOnlyFile = "read-only";
+const char* const ClaimedElsewhere = "being rewritten by another run";
+#ifdef _WIN32
+// Beyond the end of any catalogue: Windows locks keep readers out of the bytes they cover.
+const long ClaimLockOffset = 0x7FFFFFFE;
+#endif
 
 char LowerAscii(char c) { return (c >= 'A' && c <= 'Z') ? static_cast<char>(c - 'A' + 'a') : c; }
 
-bool SameIgnoringCase(const std::string& a, const std::string& b) {
-    if (a.size() != b.size()) return false;
-    for (std::size_t i = 0; i < a.size(); ++i)
-        if (LowerAscii(a[i]) != LowerAscii(b[i])) return false;
-    return true;
+std::string Lowered(std::string_view text) {
+    std::string lowered(text);
+    for (char& c : lowered) c = LowerAscii(c);
+    return lowered;
 }
+
+bool SameIgnoringCase(const std::string& a, const std::string& b) { return a.size() == b.size() && Lowered(a) == Lowered(b); }
 
 char UpperAscii(char c) { return (c >= 'a' && c <= 'z') ? static_cast<char>(c - 'a' + 'A') : c; }
 
@@ -66,9 +100,31 @@ std::string BareName(const std::string& programPath) {
     return slash == std::string::npos ? programPath : programPath.substr(slash + 1);
 }
 
+bool IsInjected(const std::string& faultName, const std::string& name) {
+    return !faultName.empty() && SameIgnoringCase(BareName(name), faultName);
+}
+
 std::string FullProgramPath(const std::string& path) {
     if (IsAbsoluteProgramPath(path)) return path;
     return Current + "\\" + path;
+}
+
+std::string SystemReason(int error = errno) { return std::generic_category().message(error); }
+
+// Keeps why an operation on the host path failed, for verrant-cli; gives what a failure gives.
+bool Failed(const std::string& host, const std::string& reason) {
+    LastFailure = host + ": " + reason;
+    return false;
+}
+
+FileClaim Refused(const std::string& host, const std::string& reason, FileClaim result) {
+    Failed(host, reason);
+    return result;
+}
+
+bool Succeeded() {
+    LastFailure.clear();
+    return true;
 }
 
 bool Exists(const std::string& hostPath) {
@@ -76,44 +132,69 @@ bool Exists(const std::string& hostPath) {
     return fs::exists(fs::path(hostPath), error);
 }
 
-// The host path of a program path, each missing component replaced by a case-insensitive match.
-std::string ResolveHost(const std::string& programPath) {
-    std::string host = HeadlessHostPath(FullProgramPath(programPath));
-    if (Exists(host)) return host;
-    std::string resolved;
-    std::size_t start = 0;
-    if (!host.empty() && host[0] == '/') {
-        resolved = "/";
-        start = 1;
-    }
-    while (start <= host.size()) {
-        std::size_t end = host.find('/', start);
-        if (end == std::string::npos) end = host.size();
-        std::string component = host.substr(start, end - start);
-        start = end + 1;
-        if (component.empty()) continue;
-        std::string candidate = resolved.empty() || resolved.back() == '/' ? resolved + component
-                                                                           : resolved + "/" + component;
-        if (!Exists(candidate) && component != "." && component != "..") {
-            std::string best;
-            std::error_code error;
-            for (fs::directory_iterator it(resolved.empty() ? "." : resolved, error), last; !error && it != last;
-                 it.increment(error)) {
-                std::string name = it->path().filename().string();
-                if (SameIgnoringCase(name, component) && (best.empty() || LessIgnoringCase(name, best)))
-                    best = name;
-            }
-            if (!best.empty())
-                candidate = resolved.empty() || resolved.back() == '/' ? resolved + best : resolved + "/" + best;
+// The name in the host folder that is the part without regard to ASCII letter case, "" when none.
+// A folder is listed for this once, and again only after it changed.
+std::string CaseMatch(const std::string& folder, std::string_view part) {
+    std::error_code error;
+    fs::file_time_type changed = fs::last_write_time(folder, error);
+    if (error) return "";
+    auto [it, added] = CaseListings.try_emplace(folder);
+    FolderNames& names = it->second;
+    if (added || names.changed != changed) {
+        ++Counters.caseListings;
+        names.changed = changed;
+        names.byLowered.clear();
+        for (fs::directory_iterator entry(folder, error), last; !error && entry != last; entry.increment(error)) {
+            std::string name = entry->path().filename().string();
+            auto [known, fresh] = names.byLowered.try_emplace(Lowered(name), name);
+            if (!fresh && LessIgnoringCase(name, known->second)) known->second = name;
         }
-        resolved = candidate;
     }
-    return resolved;
+    auto found = names.byLowered.find(Lowered(part));
+    return found == names.byLowered.end() ? "" : found->second;
 }
 
-bool IsRegularFile(const std::string& hostPath) {
-    std::error_code error;
-    return fs::is_regular_file(fs::path(hostPath), error);
+// The host path of a program path. Linear in its parts: after "." and ".." are taken by their text,
+// the disk is asked about the whole path, and part by part only when that fails, up to the first
+// part that nothing matches, since nothing below a missing folder exists.
+std::string ResolveHost(const std::string& programPath) {
+    const std::string host = HeadlessHostPath(FullProgramPath(programPath));
+    const std::size_t rootLength = host.rfind("//", 0) == 0                                  ? 2
+                                   : host.rfind('/', 0) == 0                                 ? 1
+                                   : host.size() >= 3 && host[1] == ':' && host[2] == '/' ? 3
+                                                                                            : 0;
+    std::vector<std::string_view> parts;
+    for (std::size_t start = rootLength; start < host.size();) {
+        std::size_t end = std::min(host.find('/', start), host.size());
+        std::string_view part(host.data() + start, end - start);
+        start = end + 1;
+        if (part.empty() || part == ".") continue;
+        if (part != "..") parts.push_back(part);
+        else if (!parts.empty() && parts.back() != "..") parts.pop_back();
+        else if (rootLength == 0) parts.push_back(part);  // above a relative path's start; at a root it stays
+    }
+    std::string resolved = host.substr(0, rootLength);
+    auto append = [&resolved](std::string_view part) {
+        if (!resolved.empty() && resolved.back() != '/') resolved += '/';
+        resolved += part;
+    };
+    for (std::string_view part : parts) append(part);
+    if (parts.empty() || Exists(resolved)) return resolved;
+    resolved.resize(rootLength);
+    for (std::size_t i = 0; i < parts.size(); ++i) {
+        std::string folder = resolved.empty() ? "." : resolved;
+        std::size_t folderEnd = resolved.size();
+        append(parts[i]);
+        if (Exists(resolved)) continue;
+        std::string match = CaseMatch(folder, parts[i]);
+        if (match.empty()) {
+            while (++i < parts.size()) append(parts[i]);
+            return resolved;
+        }
+        resolved.resize(folderEnd);
+        append(match);
+    }
+    return resolved;
 }
 
 bool IsFolder(const std::string& hostPath) {
@@ -121,11 +202,20 @@ bool IsFolder(const std::string& hostPath) {
     return fs::is_directory(fs::path(hostPath), error);
 }
 
-Handle Remember(std::FILE* stream, const std::string& name) {
+// Why the host path is no folder: missing, or something else.
+std::string NoFolderReason(const std::string& hostPath) {
+    std::error_code error;
+    fs::file_status status = fs::status(fs::path(hostPath), error);
+    return fs::exists(status) ? SystemReason(ENOTDIR) : error ? error.message() : SystemReason(ENOENT);
+}
+
+Handle Remember(std::FILE* stream, const std::string& name, const std::string& hostPath) {
     OpenFile file;
     file.stream = stream;
     file.bareName = BareName(name);
+    file.hostPath = hostPath;
     Files[++LastFileHandle] = file;
+    Succeeded();
     return LastFileHandle;
 }
 
@@ -133,6 +223,136 @@ OpenFile* FindFile(Handle handle) {
     auto it = Files.find(handle);
     return it == Files.end() ? nullptr : &it->second;
 }
+
+ClaimedFile* FindClaim(Handle handle) {
+    auto it = Claims.find(handle);
+    return it == Claims.end() ? nullptr : &it->second;
+}
+
+#ifdef _WIN32
+// Windows has no links or pipes to fear here: an existing name must be a plain file.
+std::FILE* OpenPlainFile(const std::string& host, bool forWriting) {
+    std::error_code error;
+    fs::file_status status = fs::symlink_status(fs::path(host), error);
+    std::FILE* stream = nullptr;
+    if (fs::exists(status) && !fs::is_regular_file(status))
+        Failed(host, fs::is_directory(status) ? SystemReason(EISDIR) : NotPlainFile);
+    else if (!forWriting && !fs::exists(status))
+        Failed(host, SystemReason(ENOENT));
+    else if (!(stream = std::fopen(host.c_str(), forWriting ? "wb" : "rb")))
+        Failed(host, SystemReason());
+    return stream;
+}
+
+std::FILE* CreateExclusively(const std::string& host, const ClaimedFile&) {
+    int descriptor = _sopen(host.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _SH_DENYWR, _S_IREAD | _S_IWRITE);
+    std::FILE* stream = descriptor < 0 ? nullptr : _fdopen(descriptor, "wb");
+    if (!stream) Failed(host, SystemReason());
+    return stream;
+}
+
+FileClaim TakeClaim(const std::string& host, ClaimedFile& claimed) {
+    claimed.descriptor = _sopen(host.c_str(), _O_RDONLY | _O_BINARY, _SH_DENYNO);
+    claimed.target = host;
+    if (claimed.descriptor < 0) return Refused(host, SystemReason(), FileClaim::NotOpened);
+    if (fstat(claimed.descriptor, &claimed.status) != 0 || !S_ISREG(claimed.status.st_mode))
+        return Refused(host, NotPlainFile, FileClaim::NotOpened);
+    if (!(claimed.status.st_mode & _S_IWRITE)) return Refused(host, ReadOnlyFile, FileClaim::ReadOnly);
+    if (_lseek(claimed.descriptor, ClaimLockOffset, SEEK_SET) != ClaimLockOffset ||
+        _locking(claimed.descriptor, _LK_NBLCK, 1) != 0)
+        return Refused(host, ClaimedElsewhere, FileClaim::Busy);
+    return FileClaim::Taken;
+}
+
+void DropClaim(ClaimedFile& claimed) {
+    if (claimed.descriptor < 0) return;
+    if (_lseek(claimed.descriptor, ClaimLockOffset, SEEK_SET) == ClaimLockOffset)
+        _locking(claimed.descriptor, _LK_UNLCK, 1);
+    _close(claimed.descriptor);
+    claimed.descriptor = -1;
+}
+
+// Windows replaces no file that is open, so the claim ends just before the replacement moves in.
+bool MoveIntoPlace(std::FILE* replacement, const std::string& source, ClaimedFile& claimed) {
+    bool written = std::fflush(replacement) == 0 && _commit(_fileno(replacement)) == 0;
+    bool closed = std::fclose(replacement) == 0;
+    if (!written || !closed) return Failed(source, SystemReason());
+    DropClaim(claimed);
+    std::error_code error;
+    fs::rename(fs::path(source), fs::path(claimed.target), error);
+    return !error || Failed(claimed.target, error.message());
+}
+#else
+// Opened without waiting, so a pipe cannot hang the program, and never through a link for writing.
+std::FILE* OpenPlainFile(const std::string& host, bool forWriting) {
+    int flags = forWriting ? O_WRONLY | O_CREAT | O_NOFOLLOW : O_RDONLY;
+    int descriptor = open(host.c_str(), flags | O_NONBLOCK | O_CLOEXEC, 0666);
+    if (descriptor < 0) {
+        Failed(host, errno == ELOOP ? "a link" : SystemReason());
+        return nullptr;
+    }
+    struct stat status {};
+    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (forWriting && ftruncate(descriptor, 0) != 0)) {
+        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
+        close(descriptor);
+        return nullptr;
+    }
+    std::FILE* stream = fdopen(descriptor, forWriting ? "wb" : "rb");
+    if (!stream) close(descriptor);
+    return stream;
+}
+
+// The owner first: a change of owner may clear mode bits.
+std::FILE* CreateExclusively(const std::string& host, const ClaimedFile& claimed) {
+    int descriptor = open(host.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600);
+    if (descriptor < 0) {
+        Failed(host, SystemReason());
+        return nullptr;
+    }
+    if (fchown(descriptor, claimed.status.st_uid, claimed.status.st_gid) != 0 &&
+        fchown(descriptor, static_cast<uid_t>(-1), claimed.status.st_gid) != 0) {
+        // Not the owner's to give away: the file stays the runner's.
+    }
+    std::FILE* stream = fchmod(descriptor, claimed.status.st_mode & 07777) == 0 ? fdopen(descriptor, "wb") : nullptr;
+    if (!stream) {
+        Failed(host, SystemReason());
+        close(descriptor);
+        unlink(host.c_str());
+    }
+    return stream;
+}
+
+// A run that replaced the file between the open and the lock leaves this one holding the old file,
+// which is no longer the catalogue: that run won.
+FileClaim TakeClaim(const std::string& host, ClaimedFile& claimed) {
+    claimed.descriptor = open(host.c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
+    if (claimed.descriptor < 0) return Refused(host, SystemReason(), FileClaim::NotOpened);
+    struct stat now {};
+    if (fstat(claimed.descriptor, &claimed.status) != 0 || !S_ISREG(claimed.status.st_mode))
+        return Refused(host, NotPlainFile, FileClaim::NotOpened);
+    if ((claimed.status.st_mode & 0222) == 0) return Refused(host, ReadOnlyFile, FileClaim::ReadOnly);
+    if (flock(claimed.descriptor, LOCK_EX | LOCK_NB) != 0 || stat(host.c_str(), &now) != 0 ||
+        now.st_ino != claimed.status.st_ino || now.st_dev != claimed.status.st_dev)
+        return Refused(host, ClaimedElsewhere, FileClaim::Busy);
+    std::error_code error;
+    claimed.target = fs::canonical(fs::path(host), error).string();
+    if (error) claimed.target = host;
+    return FileClaim::Taken;
+}
+
+void DropClaim(ClaimedFile& claimed) {
+    if (claimed.descriptor >= 0) close(claimed.descriptor);
+    claimed.descriptor = -1;
+}
+
+// The claim holds on past the move, so no run takes the old file in the meantime.
+bool MoveIntoPlace(std::FILE* replacement, const std::string& source, ClaimedFile& claimed) {
+    bool written = std::fflush(replacement) == 0 && fsync(fileno(replacement)) == 0;
+    bool closed = std::fclose(replacement) == 0;
+    if (!written || !closed) return Failed(source, SystemReason());
+    return std::rename(source.c_str(), claimed.target.c_str()) == 0 || Failed(claimed.target, SystemReason());
+}
+#endif
 
 // Windows patterns: "*" any run, "?" one character, letters without regard to case; "*.*" is all.
 bool MatchesPattern(const std::string& name, const std::string& pattern) {
@@ -161,6 +381,10 @@ bool MatchesPattern(const std::string& name, const std::string& pattern) {
 void HeadlessResetFiles() {
     for (auto& entry : Files) std::fclose(entry.second.stream);
     Files.clear();
+    for (auto& entry : Claims) DropClaim(entry.second);
+    Claims.clear();
+    CaseListings.clear();
+    LastFailure.clear();
     std::error_code error;
     Current = HeadlessProgramPath(fs::current_path(error).string());
     Faults = HeadlessFileFaults();
@@ -184,32 +408,38 @@ std::string HeadlessProgramPath(const std::string& hostPath) {
 void HeadlessSetFileFaults(const HeadlessFileFaults& faults) { Faults = faults; }
 HeadlessFileCounters HeadlessCounters() { return Counters; }
 
+std::string HeadlessTakeFailure() {
+    std::string failure;
+    failure.swap(LastFailure);
+    return failure;
+}
+
 bool MakeFolderCurrent(const std::string& folder) {
     if (folder.empty()) return false;
     std::string full = FullProgramPath(folder);
-    if (!IsFolder(ResolveHost(full))) return false;
+    std::string host = ResolveHost(full);
+    if (!IsFolder(host)) return Failed(host, NoFolderReason(host));
     while (full.size() > 1 && full.back() == '\\') full.pop_back();
     Current = full;
-    return true;
+    return Succeeded();
 }
 
 std::string CurrentFolder() { return Current; }
 
 Handle OpenForReading(const std::string& name) {
     ++Counters.opens;
-    if (!Faults.failOpen.empty() && SameIgnoringCase(BareName(name), Faults.failOpen)) return 0;
     std::string host = ResolveHost(name);
-    if (!IsRegularFile(host)) return 0;
-    std::FILE* stream = std::fopen(host.c_str(), "rb");
-    return stream ? Remember(stream, name) : 0;
+    if (IsInjected(Faults.failOpen, name)) return Failed(host, InjectedFault);
+    std::FILE* stream = OpenPlainFile(host, false);
+    return stream ? Remember(stream, name, host) : 0;
 }
 
 Handle CreateForWriting(const std::string& name) {
-    if (!Faults.failCreate.empty() && SameIgnoringCase(BareName(name), Faults.failCreate)) return 0;
     std::string host = ResolveHost(name);
-    if (IsFolder(host)) return 0;
-    std::FILE* stream = std::fopen(host.c_str(), "wb");
-    return stream ? Remember(stream, name) : 0;
+    if (IsInjected(Faults.failCreate, name)) return Failed(host, InjectedFault);
+    CaseListings.clear();
+    std::FILE* stream = OpenPlainFile(host, true);
+    return stream ? Remember(stream, name, host) : 0;
 }
 
 std::size_t FileSizeOf(Handle handle) {
@@ -222,14 +452,17 @@ std::size_t FileSizeOf(Handle handle) {
 std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
     OpenFile* file = FindFile(handle);
     if (!file || file->readFailed) return 0;
+    bool injected = false;
     if (Faults.failReadAfterBytes >= 0 && SameIgnoringCase(file->bareName, Faults.failReadName) &&
         file->read + static_cast<long long>(size) > Faults.failReadAfterBytes) {
         size = static_cast<std::size_t>(std::max(0LL, Faults.failReadAfterBytes - file->read));
-        file->readFailed = size == 0;
+        injected = file->readFailed = size == 0;
     }
     std::size_t done = std::fread(buffer, 1, size, file->stream);
     file->read += static_cast<long long>(done);
     if (std::ferror(file->stream)) file->readFailed = true;
+    if (file->readFailed) Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
+    else LastFailure.clear();
     return done;
 }
 
@@ -250,23 +483,27 @@ bool WriteBytes(Handle handle, const char* data, std::size_t size) {
     }
     std::size_t done = std::fwrite(data, 1, allowed, file->stream);
     file->written += static_cast<long long>(done);
-    return !injected && done == size;
+    if (injected || done != size) return Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
+    return Succeeded();
 }
 
 bool FlushToDisk(Handle handle) {
     OpenFile* file = FindFile(handle);
-    if (!file || std::fflush(file->stream) != 0) return false;
+    if (!file) return false;
 #ifdef _WIN32
-    return _commit(_fileno(file->stream)) == 0;
+    bool flushed = std::fflush(file->stream) == 0 && _commit(_fileno(file->stream)) == 0;
 #else
-    return fsync(fileno(file->stream)) == 0;
+    bool flushed = std::fflush(file->stream) == 0 && fsync(fileno(file->stream)) == 0;
 #endif
+    return flushed ? Succeeded() : Failed(file->hostPath, SystemReason());
 }
 
+// Closing and removing clean up after a failure already told, so they leave its reason alone.
 bool CloseFile(Handle handle) {
     auto it = Files.find(handle);
     if (it == Files.end()) return false;
     bool closed = std::fclose(it->second.stream) == 0;
+    if (!closed) Failed(it->second.hostPath, SystemReason());
     Files.erase(it);
     return closed;
 }
@@ -274,18 +511,61 @@ bool CloseFile(Handle handle) {
 bool RemoveFile(const std::string& name) {
     if (Faults.failRemove) return false;
     std::string host = ResolveHost(name);
-    if (!IsRegularFile(host)) return false;
     std::error_code error;
+    if (!fs::is_regular_file(fs::symlink_status(fs::path(host), error))) return false;
+    CaseListings.clear();
     return fs::remove(fs::path(host), error);
 }
 
-bool ReplaceFileWith(const std::string& target, const std::string& source) {
-    if (Faults.failReplace) return false;
-    std::string from = ResolveHost(source);
-    if (!IsRegularFile(from)) return false;
-    std::error_code error;
-    fs::rename(fs::path(from), fs::path(ResolveHost(target)), error);
-    return !error;
+FileClaim ClaimForRewrite(const std::string& name, Handle& claim) {
+    claim = 0;
+    std::string host = ResolveHost(name);
+    if (IsInjected(Faults.failOpen, name)) {
+        Failed(host, InjectedFault);
+        return FileClaim::NotOpened;
+    }
+    ClaimedFile claimed;
+    FileClaim result = TakeClaim(host, claimed);
+    if (result != FileClaim::Taken) {
+        DropClaim(claimed);
+        return result;
+    }
+    Claims[++LastFileHandle] = claimed;
+    claim = LastFileHandle;
+    Succeeded();
+    return result;
+}
+
+Handle CreateReplacement(Handle claim, const std::string& name) {
+    std::string host = ResolveHost(name);
+    const ClaimedFile* claimed = FindClaim(claim);
+    if (!claimed) return Failed(host, "no claim");
+    if (IsInjected(Faults.failCreate, name)) return Failed(host, InjectedFault);
+    CaseListings.clear();
+    std::FILE* stream = CreateExclusively(host, *claimed);
+    return stream ? Remember(stream, name, host) : 0;
+}
+
+bool ReplaceClaimedFile(Handle claim, Handle replacement) {
+    ClaimedFile* claimed = FindClaim(claim);
+    auto file = Files.find(replacement);
+    if (!claimed || file == Files.end()) return false;
+    std::FILE* stream = file->second.stream;
+    std::string source = file->second.hostPath;
+    Files.erase(file);
+    if (Faults.failReplace) {
+        std::fclose(stream);
+        return Failed(claimed->target, InjectedFault);
+    }
+    CaseListings.clear();
+    return MoveIntoPlace(stream, source, *claimed) && Succeeded();
+}
+
+void ReleaseClaim(Handle claim) {
+    ClaimedFile* claimed = FindClaim(claim);
+    if (!claimed) return;
+    DropClaim(*claimed);
+    Claims.erase(claim);
 }
 
 bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
@@ -297,7 +577,7 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
                                                      : pattern.substr(0, slash);
     std::string filter = slash == std::string::npos ? pattern : pattern.substr(slash + 1);
     std::string host = ResolveHost(folder);
-    if (!IsFolder(host)) return false;
+    if (!IsFolder(host)) return Failed(host, NoFolderReason(host));
     std::error_code error;
     std::vector<FolderEntry> found;
     for (fs::directory_iterator it(host, error), last; !error && it != last; it.increment(error)) {
@@ -307,11 +587,11 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
         entry.isFolder = it->is_directory(kindError);
         if (MatchesPattern(entry.name, filter)) found.push_back(entry);
     }
-    if (error) return false;
+    if (error) return Failed(host, error.message());
     std::sort(found.begin(), found.end(),
               [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     if (MatchesPattern(".", filter)) entries.push_back({".", true});
     if (MatchesPattern("..", filter)) entries.push_back({"..", true});
     entries.insert(entries.end(), found.begin(), found.end());
-    return true;
+    return Succeeded();
 }
