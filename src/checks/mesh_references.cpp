@@ -236,7 +236,7 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
 
 CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
     const bool missingMode = check == MeshCheck::MissingMeshes;
-    Handle waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
+    Handle waitWindow = OpenWindowOrEnd("Wait", 400, 340, 180, 40, FrameStyle{});
     Handle bar = AddProgressBar(waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
         ClearProgressList();

@@ -88,6 +88,18 @@ TEST_F(StartupTest, ShutdownClosesTheProgressListToo) {
     EXPECT_FALSE(AnyWindowOpen());
 }
 
+TEST_F(StartupTest, WindowThatCannotBeMadeEndsTheProgramWithAMessage) {
+    for (const std::string& title : {Main, Chooser}) {
+        auto start = [&title] {
+            HeadlessEcho(false, true);
+            HeadlessSetWindowFails(title);
+            RunVerrant();
+            std::exit(0);
+        };
+        EXPECT_EXIT(start(), ::testing::ExitedWithCode(2), "Window failure: Can't open the window " + title);
+    }
+}
+
 TEST_F(StartupTest, StartFolderEndsInOneBackslash) {
     MakeFolderCurrent("\\");
     HeadlessScript(CloseStep(Chooser));
