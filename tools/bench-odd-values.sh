@@ -31,10 +31,6 @@ for parts in 10000 100000; do
         "$(measure "$cli" wrong-sim-references --catalogue "$catalogue" --report-dir "$work")"
 done
 
-printf "%-52s %8s s\n" "a --catalogue path of 16000 \"./\" parts" \
-    "$(measure "$cli" doubled-objects --catalogue "$catalogue/$(repeat ./ 16000)" --report-dir "$work")"
-printf "%-52s %8s s\n" "a --catalogue path of 16000 \"x/../\" parts" \
-    "$(measure "$cli" doubled-objects --catalogue "$catalogue/$(repeat x/../ 8000)" --report-dir "$work")"
 printf "%-52s %8s s\n" "a --catalogue path of 16000 missing parts" \
     "$(measure "$cli" doubled-objects --catalogue "$work/$(repeat x/ 16000)" --report-dir "$work")"
 

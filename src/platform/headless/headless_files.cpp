@@ -9,7 +9,6 @@
 
 #include <algorithm>
 #include <cerrno>
-#include <cstdio>
 #include <filesystem>
 #include <map>
 #include <string_view>
@@ -20,6 +19,7 @@
 #include <share.h>
 #include <sys/locking.h>
 #else
+#include <dirent.h>
 #include <sys/file.h>
 #include <unistd.h>
 #endif
@@ -29,7 +29,7 @@ namespace fs = std::filesystem;
 namespace {
 
 struct OpenFile {
-    std::FILE* stream = nullptr;
+    int descriptor = -1;
     std::string bareName;
     std::string hostPath;
     long long written = 0;
@@ -57,15 +57,12 @@ std::string Current;  // program path of the current folder, no trailing "\"
 HeadlessFileFaults Faults;
 HeadlessFileCounters Counters;
 std::unordered_map<std::string, FolderNames> CaseListings;  // host folder -> its names
+std::unordered_map<std::string, std::string> MatchedFolders;  // textual host folder -> the one it matched
 std::string LastFailure;  // "host path: reason" when the latest file operation failed
 const char* const InjectedFault = "fault injected";
 const char* const NotPlainFile = "not a plain file";
 const char* const ReadOnlyFile = "read-only";
 const char* const ClaimedElsewhere = "being rewritten by another run";
-#ifdef _WIN32
-// Beyond the end of any catalogue: Windows locks keep readers out of the bytes they cover.
-const long ClaimLockOffset = 0x7FFFFFFE;
-#endif
 
 char LowerAscii(char c) { return (c >= 'A' && c <= 'Z') ? static_cast<char>(c - 'A' + 'a') : c; }
 
@@ -75,7 +72,9 @@ std::string Lowered(std::string_view text) {
     return lowered;
 }
 
-bool SameIgnoringCase(const std::string& a, const std::string& b) { return a.size() == b.size() && Lowered(a) == Lowered(b); }
+bool SameIgnoringCase(const std::string& a, const std::string& b) {
+    return a.size() == b.size() && Lowered(a) == Lowered(b);
+}
 
 char UpperAscii(char c) { return (c >= 'a' && c <= 'z') ? static_cast<char>(c - 'a' + 'A') : c; }
 
@@ -132,6 +131,52 @@ bool Exists(const std::string& hostPath) {
     return fs::exists(fs::path(hostPath), error);
 }
 
+bool IsFolder(const std::string& hostPath) {
+    std::error_code error;
+    return fs::is_directory(fs::path(hostPath), error);
+}
+
+// Why the host path is no folder: missing, or something else.
+std::string NoFolderReason(const std::string& hostPath) {
+    std::error_code error;
+    fs::file_status status = fs::status(fs::path(hostPath), error);
+    return fs::exists(status) ? SystemReason(ENOTDIR) : error ? error.message() : SystemReason(ENOENT);
+}
+
+std::size_t RootLength(const std::string& host) {
+    if (host.rfind("//", 0) == 0) return 2;
+    if (host.rfind('/', 0) == 0) return 1;
+    return host.size() >= 3 && host[1] == ':' && host[2] == '/' ? 3 : 0;
+}
+
+// The host path of a program path with "." and ".." taken by their text, as Windows takes them, so
+// that no part of it needs the disk; linear in its parts.
+std::string TextualHostPath(const std::string& programPath) {
+    std::string host = HeadlessHostPath(FullProgramPath(programPath));
+    const std::size_t rootLength = RootLength(host);
+    // Most paths have no part to take out: they are their own textual path.
+    std::string_view rest = std::string_view(host).substr(rootLength);
+    if (!rest.empty() && rest.front() != '.' && rest.back() != '/' && rest.back() != '.' &&
+        rest.find("//") == std::string_view::npos && rest.find("/.") == std::string_view::npos)
+        return host;
+    std::vector<std::string_view> parts;
+    for (std::size_t start = rootLength; start < host.size();) {
+        std::size_t end = std::min(host.find('/', start), host.size());
+        std::string_view part(host.data() + start, end - start);
+        start = end + 1;
+        if (part.empty() || part == ".") continue;
+        if (part != "..") parts.push_back(part);
+        else if (!parts.empty() && parts.back() != "..") parts.pop_back();
+        else if (rootLength == 0) parts.push_back(part);  // above a relative path's start; a root stays
+    }
+    std::string path = host.substr(0, rootLength);
+    for (std::string_view part : parts) {
+        if (!path.empty() && path.back() != '/') path += '/';
+        path += part;
+    }
+    return path;
+}
+
 // The name in the host folder that is the part without regard to ASCII letter case, "" when none.
 // A folder is listed for this once, and again only after it changed.
 std::string CaseMatch(const std::string& folder, std::string_view part) {
@@ -154,69 +199,67 @@ std::string CaseMatch(const std::string& folder, std::string_view part) {
     return found == names.byLowered.end() ? "" : found->second;
 }
 
-// The host path of a program path. Linear in its parts: after "." and ".." are taken by their text,
-// the disk is asked about the whole path, and part by part only when that fails, up to the first
-// part that nothing matches, since nothing below a missing folder exists.
-std::string ResolveHost(const std::string& programPath) {
-    const std::string host = HeadlessHostPath(FullProgramPath(programPath));
-    const std::size_t rootLength = host.rfind("//", 0) == 0                                  ? 2
-                                   : host.rfind('/', 0) == 0                                 ? 1
-                                   : host.size() >= 3 && host[1] == ':' && host[2] == '/' ? 3
-                                                                                            : 0;
-    std::vector<std::string_view> parts;
-    for (std::size_t start = rootLength; start < host.size();) {
-        std::size_t end = std::min(host.find('/', start), host.size());
-        std::string_view part(host.data() + start, end - start);
+// What the program's own writes may change: the listings kept for letter case.
+void ForgetListings() {
+    CaseListings.clear();
+    MatchedFolders.clear();
+}
+
+// The name in the host folder in the letters it has there: the part itself when that is there.
+std::string NameInFolder(const std::string& folder, std::string_view part) {
+    std::string path = folder + "/";
+    path += part;
+    if (Exists(path)) return path;
+    std::string match = CaseMatch(folder, part);
+    return match.empty() ? path : folder + "/" + match;
+}
+
+// A textual host path with each missing part replaced by the entry that matches it in another letter
+// case. Part by part up to the first part that nothing matches, as nothing is below a missing folder;
+// a folder matched once is taken again while it is there.
+std::string MatchLetterCase(const std::string& path) {
+    const std::size_t rootLength = RootLength(path);
+    const std::size_t slash = path.rfind('/');
+    const std::string parent = slash > rootLength && slash != std::string::npos ? path.substr(0, slash) : "";
+    auto known = MatchedFolders.find(parent);
+    if (known != MatchedFolders.end() && IsFolder(known->second))
+        return NameInFolder(known->second, std::string_view(path).substr(slash + 1));
+    std::string matched = path.substr(0, rootLength);
+    for (std::size_t start = rootLength; start < path.size();) {
+        std::size_t end = std::min(path.find('/', start), path.size());
+        std::string_view part(path.data() + start, end - start);
         start = end + 1;
-        if (part.empty() || part == ".") continue;
-        if (part != "..") parts.push_back(part);
-        else if (!parts.empty() && parts.back() != "..") parts.pop_back();
-        else if (rootLength == 0) parts.push_back(part);  // above a relative path's start; at a root it stays
+        std::string folder = matched.empty() ? "." : matched;
+        std::size_t folderEnd = matched.size();
+        if (!matched.empty() && matched.back() != '/') matched += '/';
+        matched += part;
+        if (Exists(matched)) continue;
+        std::string match = CaseMatch(folder, part);
+        if (match.empty()) return matched + path.substr(std::min(end, path.size()));
+        matched.resize(folderEnd);
+        if (!matched.empty() && matched.back() != '/') matched += '/';
+        matched += match;
     }
-    std::string resolved = host.substr(0, rootLength);
-    auto append = [&resolved](std::string_view part) {
-        if (!resolved.empty() && resolved.back() != '/') resolved += '/';
-        resolved += part;
-    };
-    for (std::string_view part : parts) append(part);
-    if (parts.empty() || Exists(resolved)) return resolved;
-    resolved.resize(rootLength);
-    for (std::size_t i = 0; i < parts.size(); ++i) {
-        std::string folder = resolved.empty() ? "." : resolved;
-        std::size_t folderEnd = resolved.size();
-        append(parts[i]);
-        if (Exists(resolved)) continue;
-        std::string match = CaseMatch(folder, parts[i]);
-        if (match.empty()) {
-            while (++i < parts.size()) append(parts[i]);
-            return resolved;
-        }
-        resolved.resize(folderEnd);
-        append(match);
-    }
-    return resolved;
+    if (!parent.empty()) MatchedFolders[parent] = matched.substr(0, matched.rfind('/'));
+    return matched;
 }
 
-bool IsFolder(const std::string& hostPath) {
-    std::error_code error;
-    return fs::is_directory(fs::path(hostPath), error);
+// The host path of a program path, found on the disk in any letter case where it can be.
+std::string ResolveHost(const std::string& programPath) {
+    std::string path = TextualHostPath(programPath);
+    return Exists(path) ? path : MatchLetterCase(path);
 }
 
-// Why the host path is no folder: missing, or something else.
-std::string NoFolderReason(const std::string& hostPath) {
-    std::error_code error;
-    fs::file_status status = fs::status(fs::path(hostPath), error);
-    return fs::exists(status) ? SystemReason(ENOTDIR) : error ? error.message() : SystemReason(ENOENT);
-}
-
-Handle Remember(std::FILE* stream, const std::string& name, const std::string& hostPath) {
-    OpenFile file;
-    file.stream = stream;
-    file.bareName = BareName(name);
-    file.hostPath = hostPath;
-    Files[++LastFileHandle] = file;
-    Succeeded();
-    return LastFileHandle;
+// Opens the host file of a program path. The path as written is tried first; only when it is not
+// there is it looked for in other letter cases.
+int OpenHost(const std::string& programPath, int flags, std::string& host) {
+    host = TextualHostPath(programPath);
+    int descriptor = open(host.c_str(), flags, 0666);
+    if (descriptor >= 0 || errno != ENOENT) return descriptor;
+    std::string matched = MatchLetterCase(host);
+    if (matched == host) return descriptor;
+    host = matched;
+    return open(host.c_str(), flags, 0666);
 }
 
 OpenFile* FindFile(Handle handle) {
@@ -229,26 +272,45 @@ ClaimedFile* FindClaim(Handle handle) {
     return it == Claims.end() ? nullptr : &it->second;
 }
 
-#ifdef _WIN32
-// Windows has no links or pipes to fear here: an existing name must be a plain file.
-std::FILE* OpenPlainFile(const std::string& host, bool forWriting) {
-    std::error_code error;
-    fs::file_status status = fs::symlink_status(fs::path(host), error);
-    std::FILE* stream = nullptr;
-    if (fs::exists(status) && !fs::is_regular_file(status))
-        Failed(host, fs::is_directory(status) ? SystemReason(EISDIR) : NotPlainFile);
-    else if (!forWriting && !fs::exists(status))
-        Failed(host, SystemReason(ENOENT));
-    else if (!(stream = std::fopen(host.c_str(), forWriting ? "wb" : "rb")))
-        Failed(host, SystemReason());
-    return stream;
+// Holds a descriptor that must be a plain file, which a report created anew is emptied to.
+Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
+    struct stat status {};
+    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (emptied && ftruncate(descriptor, 0) != 0)) {
+        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
+        close(descriptor);
+        return 0;
+    }
+    OpenFile file;
+    file.descriptor = descriptor;
+    file.bareName = BareName(name);
+    file.hostPath = host;
+    Files[++LastFileHandle] = file;
+    Succeeded();
+    return LastFileHandle;
 }
 
-std::FILE* CreateExclusively(const std::string& host, const ClaimedFile&) {
-    int descriptor = _sopen(host.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _SH_DENYWR, _S_IREAD | _S_IWRITE);
-    std::FILE* stream = descriptor < 0 ? nullptr : _fdopen(descriptor, "wb");
-    if (!stream) Failed(host, SystemReason());
-    return stream;
+#ifdef _WIN32
+// A folder's entries but "." and ".."; false when it cannot be listed, errno telling why.
+bool ReadFolder(const std::string& host, std::vector<FolderEntry>& found) {
+    std::error_code error;
+    for (fs::directory_iterator it(host, error), last; !error && it != last; it.increment(error)) {
+        std::error_code kindError;
+        found.push_back({it->path().filename().string(), it->is_directory(kindError)});
+    }
+    if (error) errno = error.value();
+    return !error;
+}
+
+// Windows has no links or pipes to fear here.
+const int ReadFlags = O_RDONLY | O_BINARY;
+const int WriteFlags = O_WRONLY | O_CREAT | O_BINARY;
+// Beyond the end of any catalogue: Windows locks keep readers out of the bytes they cover.
+const long ClaimLockOffset = 0x7FFFFFFE;
+
+int FlushDescriptor(int descriptor) { return _commit(descriptor); }
+
+int CreateExclusively(const std::string& host, const ClaimedFile&) {
+    return _sopen(host.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _SH_DENYWR, _S_IREAD | _S_IWRITE);
 }
 
 FileClaim TakeClaim(const std::string& host, ClaimedFile& claimed) {
@@ -273,53 +335,52 @@ void DropClaim(ClaimedFile& claimed) {
 }
 
 // Windows replaces no file that is open, so the claim ends just before the replacement moves in.
-bool MoveIntoPlace(std::FILE* replacement, const std::string& source, ClaimedFile& claimed) {
-    bool written = std::fflush(replacement) == 0 && _commit(_fileno(replacement)) == 0;
-    bool closed = std::fclose(replacement) == 0;
-    if (!written || !closed) return Failed(source, SystemReason());
+bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
     DropClaim(claimed);
     std::error_code error;
     fs::rename(fs::path(source), fs::path(claimed.target), error);
     return !error || Failed(claimed.target, error.message());
 }
 #else
-// Opened without waiting, so a pipe cannot hang the program, and never through a link for writing.
-std::FILE* OpenPlainFile(const std::string& host, bool forWriting) {
-    int flags = forWriting ? O_WRONLY | O_CREAT | O_NOFOLLOW : O_RDONLY;
-    int descriptor = open(host.c_str(), flags | O_NONBLOCK | O_CLOEXEC, 0666);
-    if (descriptor < 0) {
-        Failed(host, errno == ELOOP ? "a link" : SystemReason());
-        return nullptr;
+// The system's own listing: names and kinds come as they are, with no path made for each entry.
+bool ReadFolder(const std::string& host, std::vector<FolderEntry>& found) {
+    DIR* listing = opendir(host.c_str());
+    if (!listing) return false;
+    errno = 0;
+    while (const dirent* entry = readdir(listing)) {
+        std::string name = entry->d_name;
+        if (name == "." || name == "..") continue;
+        bool isFolder = entry->d_type == DT_DIR;
+        if (entry->d_type == DT_LNK || entry->d_type == DT_UNKNOWN) isFolder = IsFolder(host + "/" + name);
+        found.push_back({name, isFolder});
+        errno = 0;
     }
-    struct stat status {};
-    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (forWriting && ftruncate(descriptor, 0) != 0)) {
-        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
-        close(descriptor);
-        return nullptr;
-    }
-    std::FILE* stream = fdopen(descriptor, forWriting ? "wb" : "rb");
-    if (!stream) close(descriptor);
-    return stream;
+    int error = errno;
+    closedir(listing);
+    errno = error;
+    return error == 0;
 }
 
-// The owner first: a change of owner may clear mode bits.
-std::FILE* CreateExclusively(const std::string& host, const ClaimedFile& claimed) {
+// Opened without waiting, so a pipe cannot hang the program, and never through a link for writing.
+const int ReadFlags = O_RDONLY | O_NONBLOCK | O_CLOEXEC;
+const int WriteFlags = O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
+
+int FlushDescriptor(int descriptor) { return fsync(descriptor); }
+
+// The owner first, since a change of owner may clear mode bits; one the runner may not give stays
+// the runner's.
+int CreateExclusively(const std::string& host, const ClaimedFile& claimed) {
     int descriptor = open(host.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600);
-    if (descriptor < 0) {
-        Failed(host, SystemReason());
-        return nullptr;
-    }
+    if (descriptor < 0) return descriptor;
     if (fchown(descriptor, claimed.status.st_uid, claimed.status.st_gid) != 0 &&
         fchown(descriptor, static_cast<uid_t>(-1), claimed.status.st_gid) != 0) {
-        // Not the owner's to give away: the file stays the runner's.
     }
-    std::FILE* stream = fchmod(descriptor, claimed.status.st_mode & 07777) == 0 ? fdopen(descriptor, "wb") : nullptr;
-    if (!stream) {
-        Failed(host, SystemReason());
-        close(descriptor);
-        unlink(host.c_str());
-    }
-    return stream;
+    if (fchmod(descriptor, claimed.status.st_mode & 07777) == 0) return descriptor;
+    int error = errno;
+    close(descriptor);
+    unlink(host.c_str());
+    errno = error;
+    return -1;
 }
 
 // A run that replaced the file between the open and the lock leaves this one holding the old file,
@@ -346,10 +407,7 @@ void DropClaim(ClaimedFile& claimed) {
 }
 
 // The claim holds on past the move, so no run takes the old file in the meantime.
-bool MoveIntoPlace(std::FILE* replacement, const std::string& source, ClaimedFile& claimed) {
-    bool written = std::fflush(replacement) == 0 && fsync(fileno(replacement)) == 0;
-    bool closed = std::fclose(replacement) == 0;
-    if (!written || !closed) return Failed(source, SystemReason());
+bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
     return std::rename(source.c_str(), claimed.target.c_str()) == 0 || Failed(claimed.target, SystemReason());
 }
 #endif
@@ -379,11 +437,11 @@ bool MatchesPattern(const std::string& name, const std::string& pattern) {
 }  // namespace
 
 void HeadlessResetFiles() {
-    for (auto& entry : Files) std::fclose(entry.second.stream);
+    for (auto& entry : Files) close(entry.second.descriptor);
     Files.clear();
     for (auto& entry : Claims) DropClaim(entry.second);
     Claims.clear();
-    CaseListings.clear();
+    ForgetListings();
     LastFailure.clear();
     std::error_code error;
     Current = HeadlessProgramPath(fs::current_path(error).string());
@@ -428,24 +486,26 @@ std::string CurrentFolder() { return Current; }
 
 Handle OpenForReading(const std::string& name) {
     ++Counters.opens;
-    std::string host = ResolveHost(name);
-    if (IsInjected(Faults.failOpen, name)) return Failed(host, InjectedFault);
-    std::FILE* stream = OpenPlainFile(host, false);
-    return stream ? Remember(stream, name, host) : 0;
+    std::string host;
+    if (IsInjected(Faults.failOpen, name)) return Failed(ResolveHost(name), InjectedFault);
+    int descriptor = OpenHost(name, ReadFlags, host);
+    if (descriptor < 0) return Failed(host, SystemReason());
+    return Remember(descriptor, name, host, false);
 }
 
 Handle CreateForWriting(const std::string& name) {
     std::string host = ResolveHost(name);
     if (IsInjected(Faults.failCreate, name)) return Failed(host, InjectedFault);
-    CaseListings.clear();
-    std::FILE* stream = OpenPlainFile(host, true);
-    return stream ? Remember(stream, name, host) : 0;
+    ForgetListings();
+    int descriptor = open(host.c_str(), WriteFlags, 0666);
+    if (descriptor < 0) return Failed(host, errno == ELOOP ? "a link" : SystemReason().c_str());
+    return Remember(descriptor, name, host, true);
 }
 
 std::size_t FileSizeOf(Handle handle) {
     OpenFile* file = FindFile(handle);
     struct stat status {};
-    if (!file || fstat(fileno(file->stream), &status) != 0) return 0;
+    if (!file || fstat(file->descriptor, &status) != 0) return 0;
     return static_cast<std::size_t>(status.st_size);
 }
 
@@ -458,9 +518,15 @@ std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
         size = static_cast<std::size_t>(std::max(0LL, Faults.failReadAfterBytes - file->read));
         injected = file->readFailed = size == 0;
     }
-    std::size_t done = std::fread(buffer, 1, size, file->stream);
+    std::size_t done = 0;
+    while (done < size) {
+        auto got = read(file->descriptor, buffer + done, static_cast<unsigned>(std::min<std::size_t>(size - done, 1 << 30)));
+        if (got < 0 && errno == EINTR) continue;
+        if (got < 0) file->readFailed = true;
+        if (got <= 0) break;
+        done += static_cast<std::size_t>(got);
+    }
     file->read += static_cast<long long>(done);
-    if (std::ferror(file->stream)) file->readFailed = true;
     if (file->readFailed) Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
     else LastFailure.clear();
     return done;
@@ -481,7 +547,13 @@ bool WriteBytes(Handle handle, const char* data, std::size_t size) {
         allowed = static_cast<std::size_t>(std::max(0LL, Faults.failWriteAfterBytes - file->written));
         injected = true;
     }
-    std::size_t done = std::fwrite(data, 1, allowed, file->stream);
+    std::size_t done = 0;
+    while (done < allowed) {
+        auto put = write(file->descriptor, data + done, static_cast<unsigned>(std::min<std::size_t>(allowed - done, 1 << 30)));
+        if (put < 0 && errno == EINTR) continue;
+        if (put <= 0) break;
+        done += static_cast<std::size_t>(put);
+    }
     file->written += static_cast<long long>(done);
     if (injected || done != size) return Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
     return Succeeded();
@@ -490,19 +562,14 @@ bool WriteBytes(Handle handle, const char* data, std::size_t size) {
 bool FlushToDisk(Handle handle) {
     OpenFile* file = FindFile(handle);
     if (!file) return false;
-#ifdef _WIN32
-    bool flushed = std::fflush(file->stream) == 0 && _commit(_fileno(file->stream)) == 0;
-#else
-    bool flushed = std::fflush(file->stream) == 0 && fsync(fileno(file->stream)) == 0;
-#endif
-    return flushed ? Succeeded() : Failed(file->hostPath, SystemReason());
+    return FlushDescriptor(file->descriptor) == 0 ? Succeeded() : Failed(file->hostPath, SystemReason());
 }
 
 // Closing and removing clean up after a failure already told, so they leave its reason alone.
 bool CloseFile(Handle handle) {
     auto it = Files.find(handle);
     if (it == Files.end()) return false;
-    bool closed = std::fclose(it->second.stream) == 0;
+    bool closed = close(it->second.descriptor) == 0;
     if (!closed) Failed(it->second.hostPath, SystemReason());
     Files.erase(it);
     return closed;
@@ -513,17 +580,14 @@ bool RemoveFile(const std::string& name) {
     std::string host = ResolveHost(name);
     std::error_code error;
     if (!fs::is_regular_file(fs::symlink_status(fs::path(host), error))) return false;
-    CaseListings.clear();
+    ForgetListings();
     return fs::remove(fs::path(host), error);
 }
 
 FileClaim ClaimForRewrite(const std::string& name, Handle& claim) {
     claim = 0;
     std::string host = ResolveHost(name);
-    if (IsInjected(Faults.failOpen, name)) {
-        Failed(host, InjectedFault);
-        return FileClaim::NotOpened;
-    }
+    if (IsInjected(Faults.failOpen, name)) return Refused(host, InjectedFault, FileClaim::NotOpened);
     ClaimedFile claimed;
     FileClaim result = TakeClaim(host, claimed);
     if (result != FileClaim::Taken) {
@@ -541,24 +605,22 @@ Handle CreateReplacement(Handle claim, const std::string& name) {
     const ClaimedFile* claimed = FindClaim(claim);
     if (!claimed) return Failed(host, "no claim");
     if (IsInjected(Faults.failCreate, name)) return Failed(host, InjectedFault);
-    CaseListings.clear();
-    std::FILE* stream = CreateExclusively(host, *claimed);
-    return stream ? Remember(stream, name, host) : 0;
+    ForgetListings();
+    int descriptor = CreateExclusively(host, *claimed);
+    if (descriptor < 0) return Failed(host, SystemReason());
+    return Remember(descriptor, name, host, false);
 }
 
 bool ReplaceClaimedFile(Handle claim, Handle replacement) {
     ClaimedFile* claimed = FindClaim(claim);
-    auto file = Files.find(replacement);
-    if (!claimed || file == Files.end()) return false;
-    std::FILE* stream = file->second.stream;
-    std::string source = file->second.hostPath;
-    Files.erase(file);
-    if (Faults.failReplace) {
-        std::fclose(stream);
-        return Failed(claimed->target, InjectedFault);
-    }
-    CaseListings.clear();
-    return MoveIntoPlace(stream, source, *claimed) && Succeeded();
+    OpenFile* file = FindFile(replacement);
+    if (!claimed || !file) return false;
+    std::string source = file->hostPath;
+    bool written = FlushDescriptor(file->descriptor) == 0 || Failed(source, SystemReason());
+    if (!CloseFile(replacement) || !written) return false;
+    if (Faults.failReplace) return Failed(claimed->target, InjectedFault);
+    ForgetListings();
+    return MoveIntoPlace(source, *claimed) && Succeeded();
 }
 
 void ReleaseClaim(Handle claim) {
@@ -568,6 +630,8 @@ void ReleaseClaim(Handle claim) {
     Claims.erase(claim);
 }
 
+// The folder as written is listed first; only when it is not there is it looked for in other letter
+// cases.
 bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
     ++Counters.listings;
     entries.clear();
@@ -576,18 +640,12 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
                          : slash == 0                ? std::string(1, '\\')
                                                      : pattern.substr(0, slash);
     std::string filter = slash == std::string::npos ? pattern : pattern.substr(slash + 1);
-    std::string host = ResolveHost(folder);
-    if (!IsFolder(host)) return Failed(host, NoFolderReason(host));
-    std::error_code error;
+    std::string host = TextualHostPath(folder);
     std::vector<FolderEntry> found;
-    for (fs::directory_iterator it(host, error), last; !error && it != last; it.increment(error)) {
-        FolderEntry entry;
-        entry.name = it->path().filename().string();
-        std::error_code kindError;
-        entry.isFolder = it->is_directory(kindError);
-        if (MatchesPattern(entry.name, filter)) found.push_back(entry);
-    }
-    if (error) return Failed(host, error.message());
+    bool listed = ReadFolder(host, found);
+    if (!listed && errno == ENOENT) listed = ReadFolder(host = MatchLetterCase(host), found);
+    if (!listed) return Failed(host, IsFolder(host) ? SystemReason() : NoFolderReason(host));
+    std::erase_if(found, [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); });
     std::sort(found.begin(), found.end(),
               [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     if (MatchesPattern(".", filter)) entries.push_back({".", true});
