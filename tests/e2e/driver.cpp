@@ -256,7 +256,7 @@ HWND CheckLayout(const std::string& title, int milliseconds = 5000) {
 }
 
 // Its standard output, the progress lines, goes through a file: Wine processes keep pipes open.
-Strings RunCli(const std::string& arguments) {
+Strings RunCli(const std::string& arguments, bool withErrors = false) {
     std::string output = Work("cli-output.txt"), line = "\"" + CliPath + "\" " + arguments;
     SECURITY_ATTRIBUTES inherited = {sizeof inherited, nullptr, TRUE};
     STARTUPINFOA startup = {};
@@ -264,6 +264,7 @@ Strings RunCli(const std::string& arguments) {
     startup.dwFlags = STARTF_USESTDHANDLES;
     startup.hStdOutput =
         CreateFileA(output.c_str(), GENERIC_WRITE, FILE_SHARE_READ, &inherited, CREATE_ALWAYS, 0, nullptr);
+    startup.hStdError = withErrors ? startup.hStdOutput : nullptr;
     PROCESS_INFORMATION cli = {};
     bool started = CreateProcessA(nullptr, line.data(), nullptr, nullptr, TRUE, 0, nullptr, WorkRoot.c_str(),
                                   &startup, &cli);
@@ -457,6 +458,31 @@ void WaitWindowDuringLongRun() {
     Close();
 }
 
+// While the program rewrites a catalogue, held there, verrant-cli.exe refuses to rewrite it too; the
+// program's rewrite then ends whole.
+void SecondRewriteRefuses() {
+    std::string folder = Work("rewrite\\"), catalogue = folder + "static.ini", text = "[***]\r\nTitle Generated\r\n";
+    for (int i = 0; i < 3000; ++i) text += "[buildings.House$Gen" + std::to_string(i) + "]\r\n";
+    std::filesystem::create_directories(folder);
+    WriteBytes(catalogue, text);
+    Start("second-rewrite", folder);
+    Click(Control(Main, "Button", 1));  // with the list on, the rewrite lets events through: it takes a while
+    WaitForWindow("List searching window");
+    ChooseMenuItem(6);
+    Require(Within(20000, [&] { return std::filesystem::exists(catalogue + ".tmp"); }),
+            "the program's rewrite makes static.ini.tmp");
+    SuspendThread(App.hThread);
+    Strings words = RunCli("renumber --catalogue " + folder, true);
+    ResumeThread(App.hThread);
+    Expect(words.size() == 2 && words[0] == "static.ini failure: Can't write static.ini.tmp",
+           "verrant-cli.exe refuses a catalogue that is being rewritten: " + (words.empty() ? "" : words[0]));
+    Within(30000, [&] { return !std::filesystem::exists(catalogue + ".tmp"); });
+    ConfirmMessage("Renumber static.ini", "Done", Main);
+    Expect(FileBytes(catalogue).rfind("[***]\r\nTitle Generated\r\n(0)\r\n[buildings.House$Gen0]\r\n", 0) == 0,
+           "the program's rewrite is whole");
+    Close();
+}
+
 }  // namespace
 
 int main(int, char** argv) {
@@ -473,6 +499,7 @@ int main(int, char** argv) {
         {"progress list; commands against verrant-cli.exe; Open static.ini", CommandsAgainstCli},
         {"missing objects window: layout, browser, report against verrant-cli.exe", MissingObjectsWindow},
         {"the Wait window during a long mesh search", WaitWindowDuringLongRun},
+        {"a second rewrite refuses while the program rewrites the catalogue", SecondRewriteRefuses},
     };
     int passed = 0, failed = 0;
     for (auto [name, run] : scenarios) {

@@ -272,23 +272,6 @@ ClaimedFile* FindClaim(Handle handle) {
     return it == Claims.end() ? nullptr : &it->second;
 }
 
-// Holds a descriptor that must be a plain file, which a report created anew is emptied to.
-Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
-    struct stat status {};
-    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (emptied && ftruncate(descriptor, 0) != 0)) {
-        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
-        close(descriptor);
-        return 0;
-    }
-    OpenFile file;
-    file.descriptor = descriptor;
-    file.bareName = BareName(name);
-    file.hostPath = host;
-    Files[++LastFileHandle] = file;
-    Succeeded();
-    return LastFileHandle;
-}
-
 #ifdef _WIN32
 // A folder's entries but "." and ".."; false when it cannot be listed, errno telling why.
 bool ReadFolder(const std::string& host, std::vector<FolderEntry>& found) {
@@ -308,6 +291,7 @@ const int WriteFlags = O_WRONLY | O_CREAT | O_BINARY;
 const long ClaimLockOffset = 0x7FFFFFFE;
 
 int FlushDescriptor(int descriptor) { return _commit(descriptor); }
+int EmptyDescriptor(int descriptor) { return _chsize(descriptor, 0); }
 
 int CreateExclusively(const std::string& host, const ClaimedFile&) {
     return _sopen(host.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _SH_DENYWR, _S_IREAD | _S_IWRITE);
@@ -366,6 +350,7 @@ const int ReadFlags = O_RDONLY | O_NONBLOCK | O_CLOEXEC;
 const int WriteFlags = O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
 
 int FlushDescriptor(int descriptor) { return fsync(descriptor); }
+int EmptyDescriptor(int descriptor) { return ftruncate(descriptor, 0); }
 
 // The owner first, since a change of owner may clear mode bits; one the runner may not give stays
 // the runner's.
@@ -411,6 +396,23 @@ bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
     return std::rename(source.c_str(), claimed.target.c_str()) == 0 || Failed(claimed.target, SystemReason());
 }
 #endif
+
+// Holds a descriptor that must be a plain file, which a report created anew is emptied to.
+Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
+    struct stat status {};
+    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (emptied && EmptyDescriptor(descriptor) != 0)) {
+        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
+        close(descriptor);
+        return 0;
+    }
+    OpenFile file;
+    file.descriptor = descriptor;
+    file.bareName = BareName(name);
+    file.hostPath = host;
+    Files[++LastFileHandle] = file;
+    Succeeded();
+    return LastFileHandle;
+}
 
 // Windows patterns: "*" any run, "?" one character, letters without regard to case; "*.*" is all.
 bool MatchesPattern(const std::string& name, const std::string& pattern) {
