@@ -39,6 +39,13 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     }
 
     WriteScratchFile("static.ini", input);
+    if (!IsTextCatalogue(input)) {
+        bool exists = false;
+        Require(RenumberCatalogue(ScratchFolder(), Numbering::Renumber) == CommandResult::Failed &&
+                    ReadScratchFile("static.ini", exists) == input,
+                "a catalogue that is not text stays as it is");
+        return 0;
+    }
     std::string renumbered = Rewrite(Numbering::Renumber);
     if (onlyNumberLinesHoldBrackets) {
         WriteScratchFile("copy/static.ini", input);
