@@ -94,9 +94,7 @@ std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering
 }
 
 bool IsTextCatalogue(std::string_view bytes) {
-    if (bytes.starts_with("\xFF\xFE") || bytes.starts_with("\xFE\xFF") ||
-        bytes.starts_with(std::string_view("\0\0\xFE\xFF", 4)))
-        return false;
+    if (bytes.starts_with("\xFF\xFE") || bytes.starts_with("\xFE\xFF")) return false;
     std::string_view firstBlock = bytes.substr(0, 4096);
     return std::count(firstBlock.begin(), firstBlock.end(), '\0') * 8 <= static_cast<std::ptrdiff_t>(firstBlock.size());
 }

@@ -9,8 +9,9 @@
 // A line that holds, between blanks, nothing but "(", decimal digits and ")".
 bool IsNumberLine(std::string_view line);
 
-// Not a UTF-16 or UTF-32 text, by its byte-order mark or by more NUL bytes in its first block than
-// the stray one a text catalogue may hold: such a catalogue is not rewritten.
+// Not a UTF-16 or UTF-32 text, by the byte-order marks of UTF-16 (and of UTF-32 in the order of
+// Windows) or by more NUL bytes in its first block than the stray one a text catalogue may hold, as
+// UTF-32 has in every character: such a catalogue is not rewritten.
 bool IsTextCatalogue(std::string_view bytes);
 
 enum class Numbering { Renumber, Denumber };

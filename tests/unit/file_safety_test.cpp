@@ -80,6 +80,11 @@ TEST_F(FileSafetyTest, LinksAndPipesAtTheTemporaryFileOrAReportAreNeverWrittenNo
             EXPECT_EQ(Status(c.at).st_mode & S_IFMT, isPipe ? S_IFIFO : S_IFLNK);
         }
     }
+    for (const char* command : {"doubled-objects", "renumber"}) {  // a pipe as the catalogue itself
+        fs::remove(Host(Objects + "static.ini"));
+        ASSERT_EQ(mkfifo(Host(Objects + "static.ini").c_str(), 0600), 0);
+        EXPECT_EQ(Run(command), CommandResult::Failed) << command;
+    }
 }
 
 TEST_F(FileSafetyTest, RewriteKeepsModeOwnerAndLinkAndLeavesAReadOnlyCatalogue) {
@@ -105,7 +110,9 @@ TEST_F(FileSafetyTest, RewriteKeepsModeOwnerAndLinkAndLeavesAReadOnlyCatalogue) 
 }
 
 TEST_F(FileSafetyTest, CatalogueThatIsNotTextIsNotRewrittenYetStillChecked) {
-    for (const std::string& bytes : {"\xFF\xFE[\0b\0"s, "\xFE\xFF\0[\0b"s, "\0\0\xFE\xFF\0\0\0["s, "[\0b\0u\0i\0l\0"s}) {
+    // Byte-order marks of UTF-16 before Cyrillic letters, which have no NUL; UTF-32 and UTF-16 without one.
+    for (const std::string& bytes : {"\xFF\xFE\x1F\x04\x40\x04"s, "\xFE\xFF\x04\x1F\x04\x40"s,
+                                     "\0\0\xFE\xFF\0\0\x04\x1F"s, "[\0b\0u\0i\0l\0"s}) {
         Restart();
         UseCatalogue(bytes);
         EXPECT_EQ(Run("renumber"), CommandResult::Failed);
