@@ -1,8 +1,8 @@
 #include "output/progress_list.h"
 
-#include "platform/platform.h"
 #include "output/app_state.h"
 #include "output/messages.h"
+#include "platform/platform.h"
 
 void OpenProgressList() {
     ProgressWindow = OpenWindowOrEnd("List searching window", 650, 320, 370, 470, FrameStyle{});

@@ -43,7 +43,8 @@ Handle CreateTemporaryFile(Handle claim, const std::string& temporary) {
 std::string RewriteClaimedCatalogue(const std::string& catalogueFolder, Numbering numbering, Handle claim) {
     std::string catalogue;
     FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
-    if (read != FileRead::Whole) return read == FileRead::NotOpened ? CantOpenToRewrite.text : CantReadCatalogue.text;
+    if (read != FileRead::Whole)
+        return read == FileRead::NotOpened ? CantOpenToRewrite.text : CantReadCatalogue.text;
     if (!IsTextCatalogue(catalogue)) return "static.ini is not a text file";
     const std::string temporary = catalogueFolder + TemporaryName;
     Handle file = CreateTemporaryFile(claim, temporary);
@@ -96,7 +97,8 @@ std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering
 bool IsTextCatalogue(std::string_view bytes) {
     if (bytes.starts_with("\xFF\xFE") || bytes.starts_with("\xFE\xFF")) return false;
     std::string_view firstBlock = bytes.substr(0, 4096);
-    return std::count(firstBlock.begin(), firstBlock.end(), '\0') * 8 <= static_cast<std::ptrdiff_t>(firstBlock.size());
+    return std::count(firstBlock.begin(), firstBlock.end(), '\0') * 8 <=
+           static_cast<std::ptrdiff_t>(firstBlock.size());
 }
 
 // static.ini is never open for writing: the new text goes to static.ini.tmp, reaches the disk, and
@@ -111,9 +113,15 @@ CommandResult RenumberCatalogue(const std::string& catalogueFolder, Numbering nu
             failure = RewriteClaimedCatalogue(catalogueFolder, numbering, claim);
             ReleaseClaim(claim);
             break;
-        case FileClaim::NotOpened: failure = CantOpenToRewrite.text; break;
-        case FileClaim::ReadOnly: failure = "Can't replace static.ini"; break;
-        case FileClaim::Busy: failure = CantWriteTemporary; break;
+        case FileClaim::NotOpened:
+            failure = CantOpenToRewrite.text;
+            break;
+        case FileClaim::ReadOnly:
+            failure = "Can't replace static.ini";
+            break;
+        case FileClaim::Busy:
+            failure = CantWriteTemporary;
+            break;
     }
     if (!failure.empty()) {
         ShowMessage("static.ini failure", failure);

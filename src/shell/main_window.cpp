@@ -1,8 +1,8 @@
 #include "shell/main_window.h"
 
-#include "platform/platform.h"
 #include "output/app_state.h"
 #include "output/messages.h"
+#include "platform/platform.h"
 
 #include <utility>
 #include <vector>

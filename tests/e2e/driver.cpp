@@ -461,7 +461,8 @@ void WaitWindowDuringLongRun() {
 // While the program rewrites a catalogue, held there, verrant-cli.exe refuses to rewrite it too; the
 // program's rewrite then ends whole.
 void SecondRewriteRefuses() {
-    std::string folder = Work("rewrite\\"), catalogue = folder + "static.ini", text = "[***]\r\nTitle Generated\r\n";
+    std::string folder = Work("rewrite\\"), catalogue = folder + "static.ini",
+                text = "[***]\r\nTitle Generated\r\n";
     for (int i = 0; i < 3000; ++i) text += "[buildings.House$Gen" + std::to_string(i) + "]\r\n";
     std::filesystem::create_directories(folder);
     WriteBytes(catalogue, text);
@@ -478,8 +479,9 @@ void SecondRewriteRefuses() {
            "verrant-cli.exe refuses a catalogue that is being rewritten: " + (words.empty() ? "" : words[0]));
     Within(30000, [&] { return !std::filesystem::exists(catalogue + ".tmp"); });
     ConfirmMessage("Renumber static.ini", "Done", Main);
-    Expect(FileBytes(catalogue).rfind("[***]\r\nTitle Generated\r\n(0)\r\n[buildings.House$Gen0]\r\n", 0) == 0,
-           "the program's rewrite is whole");
+    Expect(
+        FileBytes(catalogue).rfind("[***]\r\nTitle Generated\r\n(0)\r\n[buildings.House$Gen0]\r\n", 0) == 0,
+        "the program's rewrite is whole");
     Close();
 }
 

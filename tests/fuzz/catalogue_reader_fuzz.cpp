@@ -45,7 +45,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         const std::string& line = trimmed[i];
         Require(line == TrimSpaces(expected[i]), "a catalogue line is its physical line less blanks");
         Require(IsBuildingHeader(line) == (line.rfind("[bui", 0) == 0), "a building header begins with [bui");
-        std::string bracket(SectionNameByBracket(line)), ends(SectionNameByEnds(line)), name(ObjectNameOf(line));
+        std::string bracket(SectionNameByBracket(line)), ends(SectionNameByEnds(line)),
+            name(ObjectNameOf(line));
         if (line.size() >= 2) {
             Require(ends == line.substr(1, line.size() - 2), "the end cut drops the first and last character");
             Require(line.compare(1, bracket.size(), bracket) == 0, "the bracket cut starts after the first character");

@@ -114,7 +114,8 @@ std::vector<std::string> CatalogueLinesOf(const std::string& bytes, bool trimmed
     std::vector<std::string> lines;
     LineReader reader = LinesOf(bytes);
     std::string_view line;
-    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.emplace_back(line);
+    while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line))
+        lines.emplace_back(line);
     return lines;
 }
 

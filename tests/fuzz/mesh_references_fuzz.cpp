@@ -37,7 +37,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     ProgressListOn = size > 0 && (data[0] & 1);
     if (ProgressListOn) OpenProgressList();
 
-    CommandResult doubled = CheckMeshReferences(CatalogueFolder, ScratchFolder() + "mods\\", MeshCheck::SharedLiveDeadMeshes);
+    CommandResult doubled =
+        CheckMeshReferences(CatalogueFolder, ScratchFolder() + "mods\\", MeshCheck::SharedLiveDeadMeshes);
     bool written = false, expected = false;
     std::string report = ReadDesktopFile("Doubled_sims_or_meshes.txt", written);
     Require(written && report == BaselineOutput("mesh-index", "Doubled_sims_or_meshes.txt", expected),

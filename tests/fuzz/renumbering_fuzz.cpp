@@ -53,6 +53,7 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
         Require(renumbered == BaselineOutput("two-passes", "@static.ini", exists), "renumbering as the two passes");
     }
     Require(Rewrite(Numbering::Renumber) == renumbered, "a second renumbering changes nothing");
-    Require(Rewrite(Numbering::Denumber) == CrLfText(kept), "denumbering gives back every line but the number lines");
+    Require(Rewrite(Numbering::Denumber) == CrLfText(kept),
+            "denumbering gives back every line but the number lines");
     return 0;
 }

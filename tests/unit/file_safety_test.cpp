@@ -22,7 +22,7 @@ const std::string Catalogue = "[***]\r\nTitle Mods\r\n[buildings.House$A]\r\n";
 const std::string Renumbered = "[***]\r\nTitle Mods\r\n(0)\r\n[buildings.House$A]\r\n";
 
 class FileSafetyTest : public ScratchTest {
-protected:
+   protected:
     CommandResult Run(const char* command) { return RunCommand(*CommandNamed(command)); }
     struct stat Status(const std::string& relative) const {
         struct stat status {};
@@ -65,14 +65,17 @@ TEST_F(FileSafetyTest, LinksAndPipesAtTheTemporaryFileOrAReportAreNeverWrittenNo
         const char* command;
         std::string at, message;
     };
-    for (const Case& c : {Case{"renumber", Objects + "static.ini.tmp", "static.ini failure: Can't write static.ini.tmp"},
-                          Case{"fmb-list", "Desktop/Static_list_FMB.txt", "Report failure: Can't write Static_list_FMB.txt"}}) {
+    for (const Case& c :
+         {Case{"renumber", Objects + "static.ini.tmp", "static.ini failure: Can't write static.ini.tmp"},
+          Case{"fmb-list", "Desktop/Static_list_FMB.txt",
+               "Report failure: Can't write Static_list_FMB.txt"}}) {
         for (bool isPipe : {false, true}) {
             SCOPED_TRACE(c.at + (isPipe ? " pipe" : " link"));
             Restart();
             UseCatalogue(Catalogue);
             Write("stranger.txt", "theirs");
-            isPipe ? (void)mkfifo(Host(c.at).c_str(), 0600) : fs::create_symlink(Host("stranger.txt"), Host(c.at));
+            isPipe ? (void)mkfifo(Host(c.at).c_str(), 0600)
+                   : fs::create_symlink(Host("stranger.txt"), Host(c.at));
             EXPECT_EQ(Run(c.command), CommandResult::Failed);
             EXPECT_EQ(Messages(), Strings{c.message});
             EXPECT_EQ(Read("stranger.txt"), "theirs");

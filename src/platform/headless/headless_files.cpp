@@ -56,7 +56,7 @@ Handle LastFileHandle = 0;
 std::string Current;  // program path of the current folder, no trailing "\"
 HeadlessFileFaults Faults;
 HeadlessFileCounters Counters;
-std::unordered_map<std::string, FolderNames> CaseListings;  // host folder -> its names
+std::unordered_map<std::string, FolderNames> CaseListings;    // host folder -> its names
 std::unordered_map<std::string, std::string> MatchedFolders;  // textual host folder -> the one it matched
 std::string LastFailure;  // "host path: reason" when the latest file operation failed
 const char* const InjectedFault = "fault injected";
@@ -165,9 +165,12 @@ std::string TextualHostPath(const std::string& programPath) {
         std::string_view part(host.data() + start, end - start);
         start = end + 1;
         if (part.empty() || part == ".") continue;
-        if (part != "..") parts.push_back(part);
-        else if (!parts.empty() && parts.back() != "..") parts.pop_back();
-        else if (rootLength == 0) parts.push_back(part);  // above a relative path's start; a root stays
+        if (part != "..")
+            parts.push_back(part);
+        else if (!parts.empty() && parts.back() != "..")
+            parts.pop_back();
+        else if (rootLength == 0)
+            parts.push_back(part);  // above a relative path's start; a root stays
     }
     std::string path = host.substr(0, rootLength);
     for (std::string_view part : parts) {
@@ -189,7 +192,8 @@ std::string CaseMatch(const std::string& folder, std::string_view part) {
         ++Counters.caseListings;
         names.changed = changed;
         names.byLowered.clear();
-        for (fs::directory_iterator entry(folder, error), last; !error && entry != last; entry.increment(error)) {
+        for (fs::directory_iterator entry(folder, error), last; !error && entry != last;
+             entry.increment(error)) {
             std::string name = entry->path().filename().string();
             auto [known, fresh] = names.byLowered.try_emplace(Lowered(name), name);
             if (!fresh && LessIgnoringCase(name, known->second)) known->second = name;
@@ -297,6 +301,7 @@ int CreateExclusively(const std::string& host, const ClaimedFile&) {
     return _sopen(host.c_str(), _O_WRONLY | _O_CREAT | _O_EXCL | _O_BINARY, _SH_DENYWR, _S_IREAD | _S_IWRITE);
 }
 
+// Windows replaces no open file, so the name goes on naming the file held here.
 FileClaim TakeClaim(const std::string& host, ClaimedFile& claimed) {
     claimed.descriptor = _sopen(host.c_str(), _O_RDONLY | _O_BINARY, _SH_DENYNO);
     claimed.target = host;
@@ -352,13 +357,13 @@ const int WriteFlags = O_WRONLY | O_CREAT | O_NOFOLLOW | O_NONBLOCK | O_CLOEXEC;
 int FlushDescriptor(int descriptor) { return fsync(descriptor); }
 int EmptyDescriptor(int descriptor) { return ftruncate(descriptor, 0); }
 
-// The owner first, since a change of owner may clear mode bits; one the runner may not give stays
-// the runner's.
+// The owner first, since a change of owner may clear mode bits.
 int CreateExclusively(const std::string& host, const ClaimedFile& claimed) {
     int descriptor = open(host.c_str(), O_WRONLY | O_CREAT | O_EXCL | O_NOFOLLOW | O_CLOEXEC, 0600);
     if (descriptor < 0) return descriptor;
     if (fchown(descriptor, claimed.status.st_uid, claimed.status.st_gid) != 0 &&
         fchown(descriptor, static_cast<uid_t>(-1), claimed.status.st_gid) != 0) {
+        // Neither owner nor group is the runner's to give: the file stays the runner's own.
     }
     if (fchmod(descriptor, claimed.status.st_mode & 07777) == 0) return descriptor;
     int error = errno;
@@ -400,7 +405,8 @@ bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
 // Holds a descriptor that must be a plain file, which a report created anew is emptied to.
 Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
     struct stat status {};
-    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) || (emptied && EmptyDescriptor(descriptor) != 0)) {
+    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) ||
+        (emptied && EmptyDescriptor(descriptor) != 0)) {
         Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
         close(descriptor);
         return 0;
@@ -522,15 +528,18 @@ std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
     }
     std::size_t done = 0;
     while (done < size) {
-        auto got = read(file->descriptor, buffer + done, static_cast<unsigned>(std::min<std::size_t>(size - done, 1 << 30)));
+        auto got = read(file->descriptor, buffer + done,
+                        static_cast<unsigned>(std::min<std::size_t>(size - done, 1 << 30)));
         if (got < 0 && errno == EINTR) continue;
         if (got < 0) file->readFailed = true;
         if (got <= 0) break;
         done += static_cast<std::size_t>(got);
     }
     file->read += static_cast<long long>(done);
-    if (file->readFailed) Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
-    else LastFailure.clear();
+    if (file->readFailed)
+        Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
+    else
+        LastFailure.clear();
     return done;
 }
 
@@ -551,13 +560,15 @@ bool WriteBytes(Handle handle, const char* data, std::size_t size) {
     }
     std::size_t done = 0;
     while (done < allowed) {
-        auto put = write(file->descriptor, data + done, static_cast<unsigned>(std::min<std::size_t>(allowed - done, 1 << 30)));
+        auto put = write(file->descriptor, data + done,
+                         static_cast<unsigned>(std::min<std::size_t>(allowed - done, 1 << 30)));
         if (put < 0 && errno == EINTR) continue;
         if (put <= 0) break;
         done += static_cast<std::size_t>(put);
     }
     file->written += static_cast<long long>(done);
-    if (injected || done != size) return Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
+    if (injected || done != size)
+        return Failed(file->hostPath, injected ? InjectedFault : SystemReason().c_str());
     return Succeeded();
 }
 

@@ -31,13 +31,14 @@ bool SameFile(HANDLE file, const BY_HANDLE_FILE_INFORMATION& known) {
     BY_HANDLE_FILE_INFORMATION information;
     return GetFileInformationByHandle(file, &information) &&
            information.dwVolumeSerialNumber == known.dwVolumeSerialNumber &&
-           information.nFileIndexHigh == known.nFileIndexHigh && information.nFileIndexLow == known.nFileIndexLow;
+           information.nFileIndexHigh == known.nFileIndexHigh &&
+           information.nFileIndexLow == known.nFileIndexLow;
 }
 
 // Whether the name still names the file, not one that a finished rewrite put there meanwhile.
 bool NameStillNames(const std::string& name, const BY_HANDLE_FILE_INFORMATION& known) {
-    HANDLE again = CreateFileA(name.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE, nullptr,
-                               OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE again = CreateFileA(name.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                               nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (again == INVALID_HANDLE_VALUE) return false;
     bool same = SameFile(again, known);
     CloseHandle(again);
@@ -57,7 +58,8 @@ std::string FinalPathOf(HANDLE file, const std::string& name) {
 // file operation can then use, so a report is refused rather than written elsewhere.
 std::string LongShellPath(PCIDLIST_ABSOLUTE items) {
     std::vector<wchar_t> wide(32768);
-    if (!SHGetPathFromIDListEx(items, wide.data(), static_cast<DWORD>(wide.size()), GPFIDL_DEFAULT)) return "";
+    if (!SHGetPathFromIDListEx(items, wide.data(), static_cast<DWORD>(wide.size()), GPFIDL_DEFAULT))
+        return "";
     int length = WideCharToMultiByte(CP_ACP, 0, wide.data(), -1, nullptr, 0, nullptr, nullptr);
     if (length <= 1) return "";
     std::string path(static_cast<std::size_t>(length), '\0');
@@ -233,8 +235,9 @@ bool RemoveFile(const std::string& name) {
 // Readers, writers and the final replacement may share the file; only a second claim is kept out.
 FileClaim ClaimForRewrite(const std::string& name, Handle& claim) {
     claim = 0;
-    HANDLE file = CreateFileA(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
-                              nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file =
+        CreateFileA(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                    nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) return FileClaim::NotOpened;
     BY_HANDLE_FILE_INFORMATION information;
     OVERLAPPED lockByte = {};
@@ -265,8 +268,8 @@ Handle CreateReplacement(Handle claim, const std::string& name) {
     if (claimed == Claims.end()) return 0;
     DWORD kept = claimed->second.attributes & (FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
                                                FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_NOT_CONTENT_INDEXED);
-    HANDLE file = CreateFileA(name.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_DELETE, nullptr, CREATE_NEW,
-                              kept != 0 ? kept : FILE_ATTRIBUTE_NORMAL, nullptr);
+    HANDLE file = CreateFileA(name.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_DELETE, nullptr,
+                              CREATE_NEW, kept != 0 ? kept : FILE_ATTRIBUTE_NORMAL, nullptr);
     if (file == INVALID_HANDLE_VALUE) return 0;
     Replacements[FromFile(file)] = name;
     return FromFile(file);
