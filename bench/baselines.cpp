@@ -74,6 +74,33 @@ bool WriteFindings(const BaselineInput& input, const char* name, const char* hea
 
 //--- the catalogue checks
 
+// Every folder under the folder listed once, through the system's plain directory calls.
+long long ListFoldersBelow(const std::string& folder) {
+    DIR* listing = opendir(folder.c_str());
+    if (!listing) return 0;
+    long long entries = 0;
+    std::vector<std::string> below;
+    while (dirent* entry = readdir(listing)) {
+        ++entries;
+        std::string name = entry->d_name;
+        if (name == "." || name == "..") continue;
+        struct stat status {};
+        bool isFolder = entry->d_type == DT_DIR ||
+                        (entry->d_type == DT_UNKNOWN && lstat((folder + "/" + name).c_str(), &status) == 0 &&
+                         S_ISDIR(status.st_mode));
+        if (isFolder) below.push_back(folder + "/" + name);
+    }
+    closedir(listing);
+    for (const std::string& child : below) entries += ListFoldersBelow(child);
+    return entries;
+}
+
+// The other floor, of the mesh search: the mods tree listed once.
+bool ListModFolders(const BaselineInput& input) {
+    std::printf("%lld\n", ListFoldersBelow(input.modsRoot));
+    return true;
+}
+
 bool CountLines(const BaselineInput& input) {
     std::FILE* file = OpenRead(input.catalogueFolder + "/static.ini");
     if (!file) return false;
@@ -541,6 +568,7 @@ bool BuilderList(const BaselineInput& input, bool plus) {
 bool RunBaseline(const std::string& name, const BaselineInput& input) {
     const std::pair<const char*, std::function<bool(const BaselineInput&)>> baselines[] = {
         {"floor", CountLines},
+        {"listing-floor", ListModFolders},
         {"pairwise", PairwiseDoubles},
         {"prefix-table", PrefixTable},
         {"bare-keys", BareKeys},

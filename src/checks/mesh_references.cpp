@@ -243,7 +243,7 @@ struct MeshRun {
 
 MeshRun StartMeshRun() {
     MeshRun run;
-    run.waitWindow = OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{});
+    run.waitWindow = OpenWindowOrEnd("Wait", 400, 340, 180, 40, FrameStyle{});
     run.bar = AddProgressBar(run.waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
         ClearProgressList();

@@ -45,6 +45,12 @@ void PrintHelp(std::FILE* to) {
 
 void PrintSummaryLine(const std::string& line) { std::printf("%s\n", line.c_str()); }
 
+// After a message box's line, the file and the system's reason behind it, when a file operation failed.
+void TellFileFailure(const ShownMessage&) {
+    std::string failure = HeadlessTakeFailure();
+    if (!failure.empty()) std::fprintf(stderr, "verrant-cli: %s\n", failure.c_str());
+}
+
 // The program's own form of a host folder: absolute, "\" separators, ending in "\".
 std::string ProgramFolder(const std::string& hostFolder) {
     std::string folder = HeadlessProgramPath(hostFolder);
@@ -88,11 +94,15 @@ int main(int argc, char** argv) {
     std::string reportDir = options.reportDir.empty() ? "." : options.reportDir;
     // Through the file layer, so that the folder's name matches as the catalogue's does.
     if (!MakeFolderCurrent(ProgramFolder(reportDir))) {
-        std::fprintf(stderr, "verrant-cli: report folder %s does not exist\n", reportDir.c_str());
+        Handle file = OpenForReading(HeadlessProgramPath(reportDir));
+        std::fprintf(stderr, "verrant-cli: report folder %s %s\n", reportDir.c_str(),
+                     file != 0 ? "is a file" : "does not exist");
+        CloseFile(file);
         return ExitTrouble;
     }
     HeadlessSetDesktopFolder(ProgramFolder(reportDir));
     HeadlessEcho(options.progress, true);
+    HeadlessOnMessage(TellFileFailure);
     if (options.progress) {
         ProgressListOn = true;
         OpenProgressList();

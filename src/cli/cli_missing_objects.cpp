@@ -16,6 +16,10 @@ bool PrepareMapCheck(const CliOptions& options, std::string& selection) {
     }
     // The file name stays as the user wrote it: only "static.ini" itself is refused unread.
     std::string path = HeadlessProgramPath(options.map);
+    if (MakeFolderCurrent(path)) {
+        std::fprintf(stderr, "verrant-cli: %s is a folder, not a map file\n", options.map.c_str());
+        return false;
+    }
     std::size_t slash = path.rfind('\\');
     std::string mapFolder = path.substr(0, slash + 1);
     selection = mapFolder + "*" + path.substr(slash + 1);

@@ -46,7 +46,7 @@ std::string ChooseCatalogueFolder() {
     FrameStyle frame;
     frame.systemMenu = true;
     frame.sizingBorder = true;
-    Handle window = OpenTopWindow("Searching static.ini", 300, 320, 324, 365, frame);
+    Handle window = OpenWindowOrEnd("Searching static.ini", 300, 320, 324, 365, frame);
     AddLabel(window, "Select folder with static.ini ", 10, 10, 284, 20);
     Handle browser = AddFileBrowser(window, 10, 30, 304, 250, ChooserBrowserId, "*.*");
     Handle pathBox = AddTextBox(window, 10, 300, 304, 20);

@@ -48,7 +48,7 @@ void ShowMissingObjectsWindow(const std::string& mapsPattern) {
     FrameStyle frame;
     frame.systemMenu = true;
     frame.sizingBorder = true;
-    Handle window = OpenTopWindow("Searching missing objects", 300, 320, 324, 365, frame);
+    Handle window = OpenWindowOrEnd("Searching missing objects", 300, 320, 324, 365, frame);
     AddLabel(window, "Select mod maps file of type 'actors.static' to examine", 10, 10, 284, LabelHeight);
     Handle fileList =
         AddFileBrowser(window, 10, 30, 304, 250, FileListId, mapsPattern.empty() ? "*.*" : mapsPattern);

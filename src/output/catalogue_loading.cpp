@@ -4,7 +4,7 @@
 
 void TellCatalogueFailure(FileRead read, const CatalogueOpenFailure& notOpened) {
     if (read == FileRead::FailedPartway)
-        ShowMessage("static.ini failure", "Can't read static.ini");
+        ShowMessage(CantReadCatalogue.title, CantReadCatalogue.text);
     else if (read == FileRead::NotOpened && !notOpened.title.empty())
         ShowMessage(notOpened.title, notOpened.text);
 }

@@ -11,6 +11,9 @@ struct CatalogueOpenFailure {
     std::string title, text;
 };
 const CatalogueOpenFailure CantOpenCatalogue = {"static.ini failure", "Can't open static.ini"};
+const CatalogueOpenFailure CantOpenToRewrite = {"static.ini failure", "Can't open file static.ini"};
+// A read that failed partway, for every command alike.
+const CatalogueOpenFailure CantReadCatalogue = {"static.ini failure", "Can't read static.ini"};
 
 // Tells the user why the catalogue could not be read: a read that failed partway is
 // "Can't read static.ini" for every command, a catalogue that did not open in the command's words.

@@ -1,10 +1,11 @@
 #include "output/progress_list.h"
 
-#include "platform/platform.h"
 #include "output/app_state.h"
+#include "output/messages.h"
+#include "platform/platform.h"
 
 void OpenProgressList() {
-    ProgressWindow = OpenTopWindow("List searching window", 650, 320, 370, 470, FrameStyle{});
+    ProgressWindow = OpenWindowOrEnd("List searching window", 650, 320, 370, 470, FrameStyle{});
     ProgressList = AddListControl(ProgressWindow, 10, 20, 350, 430, 1);
 }
 

@@ -20,6 +20,9 @@ bool CreateReport(const std::string& fileName, ReportFile& report) {
         TellReportFailure(fileName);
         return false;
     }
+    report.path = folder.empty() ? CurrentFolder() : folder;
+    if (!report.path.empty() && report.path.back() != '\\') report.path += '\\';
+    report.path += fileName;
     report.file = CreateForWriting(fileName);
     if (report.file == 0) {
         TellReportFailure(fileName);
@@ -52,6 +55,7 @@ bool FinishReport(ReportFile& report) {
     if (!CloseFile(report.file)) report.failed = true;
     report.file = 0;
     if (report.failed) {
+        RemoveFile(report.path);
         TellReportFailure(report.fileName);
         return false;
     }

@@ -11,6 +11,7 @@
 struct ReportFile {
     Handle file = 0;
     std::string fileName;
+    std::string path;     // where it was created, so a report cut off can be removed from anywhere
     std::string pending;  // written out in large blocks
     bool failed = false;
 };
@@ -22,8 +23,8 @@ void WriteReportLine(ReportFile& report, std::string_view line);  // followed by
 void WriteReportText(ReportFile& report, std::string_view text);  // no line end
 // Hands the buffered text to the file; false when any of the report's text failed to reach it.
 bool WritePendingText(ReportFile& report);
-// Closes the report and opens it in the viewer; when its text did not all reach the disk the user
-// is told instead and false comes back.
+// Closes the report and opens it in the viewer; when its text did not all reach the disk the report
+// is removed, the user is told instead and false comes back.
 bool FinishReport(ReportFile& report);
 
 // The usual report of a check: with no findings the message box says so and nothing is written;

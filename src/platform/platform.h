@@ -108,7 +108,8 @@ bool MakeFolderCurrent(const std::string& folder);
 std::string CurrentFolder();  // as the system gives it, without a trailing "\" added
 
 Handle OpenForReading(const std::string& name);
-// Creates or empties the file for writing.
+// Creates or empties a plain file for writing. Anything else at the name (a link, a folder, a pipe,
+// a device) is never opened for writing: 0 comes back.
 Handle CreateForWriting(const std::string& name);
 // The file's size when it was opened, so that it can be read whole into one block; 0 when unknown.
 std::size_t FileSizeOf(Handle file);
@@ -121,9 +122,29 @@ bool WriteBytes(Handle file, const char* data, std::size_t size);
 bool FlushToDisk(Handle file);
 // False when buffered data could not be written.
 bool CloseFile(Handle file);
+// Removes a plain file; a link, a folder or anything else at the name stays.
 bool RemoveFile(const std::string& name);
-// Puts source in the place of target in one step, replacing it.
-bool ReplaceFileWith(const std::string& target, const std::string& source);
+
+//--- rewriting a file in place, one run at a time
+
+enum class FileClaim {
+    Taken,      // the file is the caller's to rewrite until ReleaseClaim
+    NotOpened,  // no plain file there that can be read
+    ReadOnly,   // marked read-only, so never replaced
+    Busy,       // another run holds it
+};
+// Takes the file the name names (a link is followed to its target) for a rewrite in place. The
+// claim keeps every other claim out until it is released or its process ends, so a run that died
+// holds nothing; it never keeps a reader out.
+FileClaim ClaimForRewrite(const std::string& name, Handle& claim);
+// Creates the claimed file's replacement for writing where nothing is at the name yet (a link
+// there is not followed), with the claimed file's mode and, where the system lets, its owner. No
+// other writer gets in while it is open. 0 when anything is at the name or it cannot be made.
+Handle CreateReplacement(Handle claim, const std::string& name);
+// Writes the replacement out to the disk, closes it and puts it in the place of the claimed file
+// (of a link's target) in one step. When that fails the replacement keeps its own name.
+bool ReplaceClaimedFile(Handle claim, Handle replacement);
+void ReleaseClaim(Handle claim);
 
 struct FolderEntry {
     std::string name;

@@ -1,7 +1,8 @@
 #include "shell/main_window.h"
 
-#include "platform/platform.h"
 #include "output/app_state.h"
+#include "output/messages.h"
+#include "platform/platform.h"
 
 #include <utility>
 #include <vector>
@@ -48,7 +49,7 @@ void OpenMainWindow() {
     FrameStyle frame;
     frame.systemMenu = true;
     frame.sizingBorder = true;
-    MainWindow = OpenTopWindow("Verrant V.1.3", 250, 250, 270, 110, frame);
+    MainWindow = OpenWindowOrEnd("Verrant V.1.3", 250, 250, 270, 110, frame);
     OpenCatalogueButton = AddPushButton(MainWindow, "Open static.ini", 5, 15, 80, 22, OpenCatalogueButtonId);
     ProgressToggle = AddToggleButton(MainWindow, "List searching", 5, 50, 80, 22, ProgressToggleId);
     // Without a menu bar the window still works with its two buttons.

@@ -360,6 +360,35 @@ void WaitWindowDuringLongRun() {
     Close();
 }
 
+// While the program rewrites a catalogue, held there, verrant-cli.exe refuses to rewrite it too; the
+// program's rewrite then ends whole.
+void SecondRewriteRefuses() {
+    std::string folder = Work("rewrite\\"), catalogue = folder + "static.ini", text = "[***]\r\nTitle Generated\r\n";
+    for (int i = 0; i < 3000; ++i) text += "[buildings.House$Gen" + std::to_string(i) + "]\r\n";
+    std::filesystem::create_directories(folder);
+    std::ofstream(catalogue, std::ios::binary) << text;
+    Start("second-rewrite", folder);
+    Click(Control(Main, "Button", 1));  // with the list on, the rewrite lets events through: it takes a while
+    WaitForWindow("List searching window");
+    ChooseMenuItem(6);
+    Require(Within(20000, [&] { return std::filesystem::exists(catalogue + ".tmp"); }),
+            "the program's rewrite makes static.ini.tmp");
+    SuspendThread(App.hThread);
+    std::string cli = "\"" + CliPath + "\" renumber --catalogue " + folder;
+    PROCESS_INFORMATION process = Launch("cmd /c \"" + cli + " >cli-output.txt 2>&1\"", WorkRoot.c_str());
+    bool ended = WaitForSingleObject(process.hProcess, 30000) == WAIT_OBJECT_0;
+    CloseHandle(process.hThread), CloseHandle(process.hProcess);
+    ResumeThread(App.hThread);
+    Strings words = FileLines(Work("cli-output.txt"));
+    Expect(ended && !words.empty() && words[0] == "static.ini failure: Can't write static.ini.tmp",
+           "verrant-cli.exe refuses a catalogue that is being rewritten: " + (words.empty() ? "" : words[0]));
+    Within(30000, [&] { return !std::filesystem::exists(catalogue + ".tmp"); });
+    ConfirmMessage("Renumber static.ini", "Done", Main);
+    Expect(FileBytes(catalogue).rfind("[***]\r\nTitle Generated\r\n(0)\r\n[buildings.House$Gen0]\r\n", 0) == 0,
+           "the program's rewrite is whole");
+    Close();
+}
+
 int Passed = 0, Failed = 0;
 
 // Runs a scenario, then ends what it left running: any Notepad, and the program.
@@ -392,6 +421,7 @@ int main(int, char** argv) {
     Run("progress list; commands against verrant-cli.exe; Open static.ini", CommandsAgainstCli);
     Run("missing objects window: layout, browser, report against verrant-cli.exe", MissingObjectsWindow);
     Run("the Wait window during a long mesh search", WaitWindowDuringLongRun);
+    Run("a second rewrite refuses while the program rewrites the catalogue", SecondRewriteRefuses);
     std::printf("%d passed, %d failed\n", Passed, Failed);
     return Failed == 0 ? 0 : 1;
 }

@@ -99,6 +99,7 @@ TEST_F(CommandFailuresTest, OutputThatCannotBeCreatedOrWritten) {
             EXPECT_TRUE(HeadlessProcesses().empty());
             EXPECT_EQ(Read("mods/std/com/maddox/il2/objects/static.ini"), Catalogue);
             EXPECT_FALSE(Exists("mods/std/com/maddox/il2/objects/static.ini.tmp"));
+            EXPECT_FALSE(Exists("Desktop/" + c.output)) << "nothing cut off is left";
         }
     }
 }

@@ -7,6 +7,7 @@
 #include "test_support.h"
 
 #include <algorithm>
+#include <chrono>
 #include <random>
 
 namespace {
@@ -148,4 +149,24 @@ TEST_F(MeshFolderSearchTest, ModFoldersInTheOrderNtfsListsThem) {
     for (const std::string mod : {"Alpha", "beta", "zeta", "[x]", "_Late"})
         expected.push_back("Check: ...\\mods\\" + mod + "\\3do");
     EXPECT_EQ(ProgressLines(), expected);
+}
+
+// Values no listing can judge are opened in every searched folder: the folder that holds them is
+// listed once for their letter case, and a climb of many ".." parts is read by its text.
+TEST_F(MeshFolderSearchTest, OddValuesDoNotStallTheSearch) {
+    Mesh("mods/Pack/3do/Many/f.sim");
+    Mesh("mods/Other/3DO/Many/g.sim");
+    std::vector<MeshIndexEntry> index;
+    for (int i = 0; i < 200; ++i)
+        index.push_back(Entry("Title Mods", "3do\\Many\\t~" + std::to_string(i) + ".sim"));
+    std::string climb, deep;
+    for (int i = 0; i < 100000; ++i) climb += "..\\";
+    for (int i = 0; i < 16000; ++i) deep += "x\\";
+    index.push_back(Entry("Title Mods", "3do\\" + climb + "x.sim"));
+    auto start = std::chrono::steady_clock::now();
+    SearchModMeshFolders(index, ModsRoot(), NewBar());
+    EXPECT_EQ(HeadlessCounters().caseListings, 4)
+        << "each Many folder, the 3DO one's mod, the root climbed to";
+    EXPECT_FALSE(MakeFolderCurrent(Folder("Game") + deep));
+    EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 5);
 }

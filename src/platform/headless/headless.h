@@ -52,13 +52,13 @@ struct StartedProcess {
 
 // Faults the file layer injects, matched on the bare file name, for tests of failure paths.
 struct HeadlessFileFaults {
-    std::string failOpen;                   // OpenForReading of this name fails
-    std::string failCreate;                 // CreateForWriting of this name fails
+    std::string failOpen;                   // OpenForReading and ClaimForRewrite of this name fail
+    std::string failCreate;                 // CreateForWriting and CreateReplacement of this name fail
     std::string failReadName;               // reads of this file fail once ...
     long long failReadAfterBytes = -1;      // ... this many bytes have been read
     std::string failWriteName;              // writes to this file fail once ...
     long long failWriteAfterBytes = -1;     // ... this many bytes have been written
-    bool failReplace = false;               // ReplaceFileWith fails
+    bool failReplace = false;               // ReplaceClaimedFile fails
     bool failRemove = false;                // RemoveFile fails
 };
 
@@ -98,6 +98,7 @@ void HeadlessSetDesktopFolder(const std::string& folder);
 void HeadlessSetProcessStarts(bool createProcessWorks, bool shellExecuteWorks);
 void HeadlessSetFileFaults(const HeadlessFileFaults& faults);
 void HeadlessSetMenuBarFails(bool fails);
+void HeadlessSetWindowFails(const std::string& title);  // opening a window of this title fails
 
 // verrant-cli: list lines to standard output, message boxes to standard error as "Title: text".
 void HeadlessEcho(bool listLines, bool messages);
@@ -109,5 +110,9 @@ std::string HeadlessProgramPath(const std::string& hostPath);
 // Counters of the file layer, for tests and benchmarks of file-system work.
 struct HeadlessFileCounters {
     long long opens = 0, listings = 0;
+    long long caseListings = 0;  // folders listed to match a name's letter case
 };
 HeadlessFileCounters HeadlessCounters();
+// "host path: the system's reason" of the latest file operation when it failed, "" when it went
+// well; forgotten once taken. Closing and removing files leave it alone.
+std::string HeadlessTakeFailure();

@@ -24,6 +24,7 @@ std::map<std::string, std::string> Environment;
 std::string DesktopFolder;
 bool CreateProcessWorks = true, ShellExecuteWorks = true;
 bool MenuBarFails = false;
+std::string FailingWindowTitle;  // OpenTopWindow of a window with this title fails
 bool EchoListLines = false, EchoMessages = false;
 
 Handle NewHandle() { return ++LastHandle; }
@@ -75,6 +76,7 @@ void InitPlatform() {}
 
 Handle OpenTopWindow(const std::string& title, int left, int top, int clientWidth, int clientHeight,
                      FrameStyle frame) {
+    if (!FailingWindowTitle.empty() && title == FailingWindowTitle) return 0;
     HeadlessWindow window;
     window.handle = NewHandle();
     window.title = title;
@@ -319,6 +321,7 @@ void HeadlessReset() {
     DesktopFolder.clear();
     CreateProcessWorks = ShellExecuteWorks = true;
     MenuBarFails = false;
+    FailingWindowTitle.clear();
     EchoListLines = EchoMessages = false;
     HeadlessResetFiles();
 }
@@ -428,6 +431,7 @@ void HeadlessSetProcessStarts(bool createProcessWorks, bool shellExecuteWorks) {
 }
 
 void HeadlessSetMenuBarFails(bool fails) { MenuBarFails = fails; }
+void HeadlessSetWindowFails(const std::string& title) { FailingWindowTitle = title; }
 
 void HeadlessEcho(bool listLines, bool messages) {
     EchoListLines = listLines;

@@ -4,7 +4,9 @@
 #include <shellapi.h>
 #include <shlobj.h>
 
+#include <map>
 #include <set>
+#include <vector>
 
 namespace {
 
@@ -13,6 +15,58 @@ HANDLE ToFile(Handle file) { return reinterpret_cast<HANDLE>(file); }
 Handle FromFile(HANDLE file) { return file == INVALID_HANDLE_VALUE ? 0 : reinterpret_cast<Handle>(file); }
 
 std::set<Handle> FailedReads;  // open files a read failed on
+
+// A file taken for a rewrite: held open with a lock on one byte far past the end of any catalogue,
+// since a Windows lock keeps readers out of the bytes it covers. verrant-cli locks the same byte.
+struct ClaimedFile {
+    HANDLE file = INVALID_HANDLE_VALUE;
+    std::string target;  // the file itself, links followed
+    DWORD attributes = 0;
+};
+const DWORD ClaimLockOffset = 0x7FFFFFFE;
+std::map<Handle, ClaimedFile> Claims;
+std::map<Handle, std::string> Replacements;  // open replacements and their names
+
+bool SameFile(HANDLE file, const BY_HANDLE_FILE_INFORMATION& known) {
+    BY_HANDLE_FILE_INFORMATION information;
+    return GetFileInformationByHandle(file, &information) &&
+           information.dwVolumeSerialNumber == known.dwVolumeSerialNumber &&
+           information.nFileIndexHigh == known.nFileIndexHigh &&
+           information.nFileIndexLow == known.nFileIndexLow;
+}
+
+// Whether the name still names the file, not one that a finished rewrite put there meanwhile.
+bool NameStillNames(const std::string& name, const BY_HANDLE_FILE_INFORMATION& known) {
+    HANDLE again = CreateFileA(name.c_str(), 0, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                               nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (again == INVALID_HANDLE_VALUE) return false;
+    bool same = SameFile(again, known);
+    CloseHandle(again);
+    return same;
+}
+
+std::string FinalPathOf(HANDLE file, const std::string& name) {
+    char path[MAX_PATH] = "";
+    DWORD length = GetFinalPathNameByHandleA(file, path, sizeof path, FILE_NAME_NORMALIZED | VOLUME_NAME_DOS);
+    if (length == 0 || length >= sizeof path) return name;
+    std::string final(path, length);
+    if (final.rfind("\\\\?\\", 0) == 0 && final.size() > 6 && final[5] == ':') final.erase(0, 4);
+    return final;
+}
+
+// A desktop whose path does not fit the 260 characters of the "A" functions: its whole path, which no
+// file operation can then use, so a report is refused rather than written elsewhere.
+std::string LongShellPath(PCIDLIST_ABSOLUTE items) {
+    std::vector<wchar_t> wide(32768);
+    if (!SHGetPathFromIDListEx(items, wide.data(), static_cast<DWORD>(wide.size()), GPFIDL_DEFAULT))
+        return "";
+    int length = WideCharToMultiByte(CP_ACP, 0, wide.data(), -1, nullptr, 0, nullptr, nullptr);
+    if (length <= 1) return "";
+    std::string path(static_cast<std::size_t>(length), '\0');
+    WideCharToMultiByte(CP_ACP, 0, wide.data(), -1, path.data(), length, nullptr, nullptr);
+    path.resize(static_cast<std::size_t>(length) - 1);
+    return path;
+}
 
 // ReadFile and WriteFile take 32-bit counts.
 DWORD Chunk(std::size_t size) { return size > 0x40000000u ? 0x40000000u : static_cast<DWORD>(size); }
@@ -44,10 +98,10 @@ std::string SystemDriveName() { return SystemWindowsFolder().substr(0, 2); }
 std::string ShellFolderPath(int folderId) {
     LPITEMIDLIST items = nullptr;
     if (FAILED(SHGetSpecialFolderLocation(nullptr, folderId, &items)) || items == nullptr) return "";
-    char path[260] = "";
-    BOOL converted = SHGetPathFromIDListA(items, path);
+    char path[MAX_PATH] = "";
+    std::string folder = SHGetPathFromIDListA(items, path) ? std::string(path) : LongShellPath(items);
     CoTaskMemFree(items);
-    return converted ? std::string(path) : std::string();
+    return folder;
 }
 
 std::string DesktopFolderPath() {
@@ -111,9 +165,19 @@ Handle OpenForReading(const std::string& name) {
     return FromFile(file);
 }
 
+// Opened where it is, never through a link, and only a file on a disk: a device or a pipe is no report.
 Handle CreateForWriting(const std::string& name) {
-    return FromFile(CreateFileA(name.c_str(), GENERIC_WRITE, FILE_SHARE_READ, nullptr, CREATE_ALWAYS,
-                                FILE_ATTRIBUTE_NORMAL, nullptr));
+    HANDLE file = CreateFileA(name.c_str(), GENERIC_WRITE, FILE_SHARE_READ, nullptr, OPEN_ALWAYS,
+                              FILE_ATTRIBUTE_NORMAL | FILE_FLAG_OPEN_REPARSE_POINT, nullptr);
+    if (file == INVALID_HANDLE_VALUE) return 0;
+    BY_HANDLE_FILE_INFORMATION information;
+    if (GetFileType(file) != FILE_TYPE_DISK || !GetFileInformationByHandle(file, &information) ||
+        (information.dwFileAttributes & (FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT)) ||
+        !SetEndOfFile(file)) {
+        CloseHandle(file);
+        return 0;
+    }
+    return FromFile(file);
 }
 
 std::size_t FileSizeOf(Handle file) {
@@ -154,14 +218,84 @@ bool ReadHasFailed(Handle file) { return FailedReads.count(file) != 0; }
 
 bool CloseFile(Handle file) {
     FailedReads.erase(file);
+    Replacements.erase(file);
     return file != 0 && CloseHandle(ToFile(file));
 }
 
-bool RemoveFile(const std::string& name) { return DeleteFileA(name.c_str()) != FALSE; }
+bool RemoveFile(const std::string& name) {
+    DWORD attributes = GetFileAttributesA(name.c_str());
+    if (attributes == INVALID_FILE_ATTRIBUTES ||
+        (attributes & (FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT)))
+        return false;
+    return DeleteFileA(name.c_str()) != FALSE;
+}
 
-bool ReplaceFileWith(const std::string& target, const std::string& source) {
-    return MoveFileExA(source.c_str(), target.c_str(), MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) !=
-           FALSE;
+//--- rewriting a file in place
+
+// Readers, writers and the final replacement may share the file; only a second claim is kept out.
+FileClaim ClaimForRewrite(const std::string& name, Handle& claim) {
+    claim = 0;
+    HANDLE file =
+        CreateFileA(name.c_str(), GENERIC_READ, FILE_SHARE_READ | FILE_SHARE_WRITE | FILE_SHARE_DELETE,
+                    nullptr, OPEN_EXISTING, FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file == INVALID_HANDLE_VALUE) return FileClaim::NotOpened;
+    BY_HANDLE_FILE_INFORMATION information;
+    OVERLAPPED lockByte = {};
+    lockByte.Offset = ClaimLockOffset;
+    FileClaim result = FileClaim::Taken;
+    if (!GetFileInformationByHandle(file, &information) ||
+        (information.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY))
+        result = FileClaim::NotOpened;
+    else if (information.dwFileAttributes & FILE_ATTRIBUTE_READONLY)
+        result = FileClaim::ReadOnly;
+    else if (!LockFileEx(file, LOCKFILE_EXCLUSIVE_LOCK | LOCKFILE_FAIL_IMMEDIATELY, 0, 1, 0, &lockByte) ||
+             !NameStillNames(name, information))
+        result = FileClaim::Busy;
+    if (result != FileClaim::Taken) {
+        CloseHandle(file);
+        return result;
+    }
+    claim = FromFile(file);
+    Claims[claim] = {file, FinalPathOf(file, name), information.dwFileAttributes};
+    return result;
+}
+
+// CREATE_NEW takes no existing file and follows no link. Sharing only reading keeps other writers out;
+// sharing deletion lets the file move into place while still open, so no other file takes its name
+// in between.
+Handle CreateReplacement(Handle claim, const std::string& name) {
+    auto claimed = Claims.find(claim);
+    if (claimed == Claims.end()) return 0;
+    DWORD kept = claimed->second.attributes & (FILE_ATTRIBUTE_HIDDEN | FILE_ATTRIBUTE_SYSTEM |
+                                               FILE_ATTRIBUTE_ARCHIVE | FILE_ATTRIBUTE_NOT_CONTENT_INDEXED);
+    HANDLE file = CreateFileA(name.c_str(), GENERIC_WRITE, FILE_SHARE_READ | FILE_SHARE_DELETE, nullptr,
+                              CREATE_NEW, kept != 0 ? kept : FILE_ATTRIBUTE_NORMAL, nullptr);
+    if (file == INVALID_HANDLE_VALUE) return 0;
+    Replacements[FromFile(file)] = name;
+    return FromFile(file);
+}
+
+// Windows replaces no file that is open: the claim ends just before the replacement moves in.
+bool ReplaceClaimedFile(Handle claim, Handle replacement) {
+    auto claimed = Claims.find(claim);
+    auto named = Replacements.find(replacement);
+    if (claimed == Claims.end() || named == Replacements.end()) return false;
+    std::string target = claimed->second.target, source = named->second;
+    bool flushed = FlushFileBuffers(ToFile(replacement)) != FALSE;
+    ReleaseClaim(claim);
+    bool moved = flushed && MoveFileExA(source.c_str(), target.c_str(),
+                                        MOVEFILE_REPLACE_EXISTING | MOVEFILE_WRITE_THROUGH) != FALSE;
+    return CloseFile(replacement) && moved;
+}
+
+void ReleaseClaim(Handle claim) {
+    auto claimed = Claims.find(claim);
+    if (claimed == Claims.end()) return;
+    OVERLAPPED lockByte = {};
+    lockByte.Offset = ClaimLockOffset;
+    UnlockFileEx(claimed->second.file, 0, 1, 0, &lockByte);
+    CloseHandle(claimed->second.file);
+    Claims.erase(claimed);
 }
 
 bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
@@ -176,6 +310,8 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
         entry.isFolder = (found.dwFileAttributes & FILE_ATTRIBUTE_DIRECTORY) != 0;
         entries.push_back(entry);
     } while (FindNextFileA(search, &found));
+    // Anything but the end of the listing leaves it incomplete.
+    bool complete = GetLastError() == ERROR_NO_MORE_FILES;
     FindClose(search);
-    return true;
+    return complete;
 }

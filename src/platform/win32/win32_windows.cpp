@@ -17,6 +17,7 @@ const char* const TopWindowClass = "VerrantWindow";
 const char* const FixedWindowClass = "VerrantFixedWindow";
 
 std::deque<Event> Queue;  // events waiting for the program, oldest first
+bool ClassesRegistered = true;  // false when the system refused a window class: no window opens
 
 bool IsButton(HWND control) {
     char name[16] = "";
@@ -72,7 +73,8 @@ void RegisterWindowClass(const char* name, UINT classStyle) {
     windowClass.hCursor = LoadCursorA(nullptr, MAKEINTRESOURCEA(32512));  // the arrow
     windowClass.hbrBackground = reinterpret_cast<HBRUSH>(COLOR_BTNFACE + 1);
     windowClass.lpszClassName = name;
-    RegisterClassExA(&windowClass);
+    if (RegisterClassExA(&windowClass) == 0 && GetLastError() != ERROR_CLASS_ALREADY_EXISTS)
+        ClassesRegistered = false;
 }
 
 Event PopEvent() {
@@ -139,6 +141,7 @@ void InitPlatform() {
 Handle OpenTopWindow(const std::string& title, int left, int top, int clientWidth, int clientHeight,
                      FrameStyle frame) {
     InitPlatform();
+    if (!ClassesRegistered) return 0;
     DWORD style = WS_OVERLAPPED | WS_CAPTION | WS_CLIPCHILDREN;
     if (frame.systemMenu) style |= WS_SYSMENU;
     if (frame.sizingBorder) style |= WS_THICKFRAME;
