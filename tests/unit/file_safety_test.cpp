@@ -39,7 +39,8 @@ TEST_F(FileSafetyTest, LiveRunKeepsTheCatalogueAndADeadOneLeavesNothingInTheWay)
     ASSERT_EQ(pipe(ready), 0);
     pid_t first = fork();
     if (first == 0) {  // stops in the middle of its rewrite, as if the machine were slow
-        SwitchListOn();
+        ProgressListOn = true;  // with the list on, the rewrite lets an event through
+        OpenProgressList();
         HeadlessPushPending([&] {
             EXPECT_EQ(write(ready[1], "!", 1), 1);
             for (;;) pause();

@@ -142,3 +142,15 @@ TEST_F(SettingsTest, LostFolderAtStartIsToldWithoutAQuestion) {
     EXPECT_EQ(Messages(), Strings({"static,ini failure: static.ini not found in " + Folder("Sim/gone")}));
     EXPECT_EQ(HeadlessWindowTitlesOpened(), Strings({Main}));
 }
+
+TEST_F(SettingsTest, WindowThatCannotBeMadeEndsTheProgramWithAMessage) {
+    for (const std::string& title : {Main, Chooser}) {
+        auto start = [&title] {
+            HeadlessEcho(false, true);
+            HeadlessSetWindowFails(title);
+            RunVerrant();
+            std::exit(0);
+        };
+        EXPECT_EXIT(start(), ::testing::ExitedWithCode(2), "Window failure: Can't open the window " + title);
+    }
+}
