@@ -6,9 +6,8 @@ set -u
 cd "$(dirname "$0")/.."
 top=$(pwd)
 count=${1:-100000}
-cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_TESTS=OFF >/dev/null &&
-    cmake --build build/release -j2 --target verrant-cli >/dev/null || exit 2
-cli="$top/build/release/src/verrant-cli"
+source tools/script-helpers.sh
+cli=$(release_cli) || exit 2
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 

@@ -6,11 +6,8 @@
 set -eu
 cd "$(dirname "$0")/.."
 cli=${1:-}
-if [ -z "$cli" ]; then
-    cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_TESTS=OFF >/dev/null
-    cmake --build build/release -j2 --target verrant-cli >/dev/null
-    cli=$(pwd)/build/release/src/verrant-cli
-fi
+source tools/script-helpers.sh
+[ -n "$cli" ] || cli=$(release_cli) || exit 2
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 

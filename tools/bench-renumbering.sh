@@ -7,9 +7,8 @@ cd "$(dirname "$0")/.."
 sizes=("$@")
 [ ${#sizes[@]} -gt 0 ] || sizes=(500000 1000000 2000000)
 
-cmake -S . -B build/release -DCMAKE_BUILD_TYPE=Release -DVERRANT_SANITIZE=OFF >/dev/null
-cmake --build build/release -j2 --target verrant-cli >/dev/null
-cli=$(pwd)/build/release/src/verrant-cli
+source tools/script-helpers.sh
+cli=$(release_cli) || exit 2
 work=$(mktemp -d)
 trap 'rm -rf "$work"' EXIT
 

@@ -5,14 +5,8 @@
 # Debian packages first when run as root. Prints the zip's path.
 set -u
 cd "$(dirname "$0")/.."
-packages=(cmake make g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64 zip)
-missing=()
-for package in "${packages[@]}"; do
-    dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
-done
-if [ ${#missing[@]} -gt 0 ] && [ "$(id -u)" = 0 ]; then
-    apt-get update -qq && DEBIAN_FRONTEND=noninteractive apt-get install -y -qq "${missing[@]}" >/dev/null
-fi
+source tools/script-helpers.sh
+ensure_packages cmake make g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64 zip
 
 version=$(sed -n 's/.*VALUE "ProductVersion", "\([0-9.]*\)".*/\1/p' src/platform/win32/verrant.rc)
 name="verrant-$version-win64"

@@ -6,15 +6,10 @@
 set -u
 cd "$(dirname "$0")/.."
 top=$(pwd)
+source tools/script-helpers.sh
 packages=(cmake make g++)
 [ -n "${DISPLAY:-}" ] && packages+=(g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64 wine wine64 fonts-wine)
-missing=()
-for package in "${packages[@]}"; do
-    dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
-done
-if [ ${#missing[@]} -gt 0 ] && [ "$(id -u)" = 0 ]; then
-    apt-get update -qq && DEBIAN_FRONTEND=noninteractive apt-get install -y -qq "${missing[@]}" >/dev/null
-fi
+ensure_packages "${packages[@]}"
 # A fresh copy each time: renumbering rewrites the catalogue it is given.
 rm -rf "$top/build/demo-tree" && mkdir -p "$top/build" && cp -r "$top/examples/demo-tree" "$top/build/demo-tree"
 catalogue="$top/build/demo-tree/mods/std/com/maddox/il2/objects"

@@ -7,21 +7,9 @@ cd "$(dirname "$0")/.."
 top=$(pwd)
 jobs=$(nproc 2>/dev/null || echo 2)
 
-packages=(cmake make g++ libgtest-dev googletest g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64
-          wine wine64 fonts-wine fonts-dejavu-core xvfb xauth imagemagick x11-utils
-          clang libclang-rt-14-dev zip unzip)
-missing=()
-for package in "${packages[@]}"; do
-    dpkg -s "$package" >/dev/null 2>&1 || missing+=("$package")
-done
-if [ ${#missing[@]} -gt 0 ]; then
-    if [ "$(id -u)" = 0 ]; then
-        echo "Installing: ${missing[*]}"
-        apt-get update -qq && DEBIAN_FRONTEND=noninteractive apt-get install -y -qq "${missing[@]}" >/dev/null
-    else
-        echo "Missing packages (run as root to install them): ${missing[*]}"
-    fi
-fi
+source tools/script-helpers.sh
+ensure_packages cmake make g++ libgtest-dev googletest g++-mingw-w64-x86-64 binutils-mingw-w64-x86-64 \
+    wine wine64 fonts-wine fonts-dejavu-core xvfb xauth imagemagick x11-utils clang libclang-rt-14-dev zip unzip
 
 passed=0
 failed=0
