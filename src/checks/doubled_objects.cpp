@@ -1,8 +1,8 @@
 #include "checks/doubled_objects.h"
 
+#include "catalogue/catalogue_reader.h"
 #include "catalogue/name_table.h"
 #include "output/app_state.h"
-#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
@@ -50,13 +50,6 @@ void ListObjectsAndDoubles(const std::vector<std::string_view>& names, const std
 }
 
 }  // namespace
-
-CommandResult FindDoubledObjects(const std::string& catalogueFolder) {
-    std::string catalogue;
-    int findings = 0;
-    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
-    return FindDoubledObjectsInCatalogue(catalogue, findings);
-}
 
 CommandResult FindDoubledObjectsInCatalogue(const std::string& catalogue, int& findings) {
     if (ProgressListOn) ClearProgressList();

@@ -17,6 +17,5 @@ struct DoubledObject {
 std::vector<DoubledObject> PairDoubledNames(const std::vector<std::string_view>& names);
 std::string DoubledObjectLine(const DoubledObject& doubled);
 
-CommandResult FindDoubledObjects(const std::string& catalogueFolder);
-// The same on the catalogue's bytes, read already; findings is the number of pairs.
+// The check on the catalogue's bytes; findings is the number of pairs.
 CommandResult FindDoubledObjectsInCatalogue(const std::string& catalogue, int& findings);

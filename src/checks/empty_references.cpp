@@ -2,7 +2,6 @@
 
 #include "catalogue/catalogue_reader.h"
 #include "output/app_state.h"
-#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
@@ -28,13 +27,6 @@ std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
     return {std::string(14, '*'), "Object " + std::to_string(reference.objectNumber),
             std::string(reference.sectionName), "Empty reference: " + std::string(reference.key)};
-}
-
-CommandResult FindEmptyReferences(const std::string& catalogueFolder) {
-    std::string catalogue;
-    int findings = 0;
-    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
-    return FindEmptyReferencesInCatalogue(catalogue, findings);
 }
 
 CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings) {

@@ -18,7 +18,6 @@ std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue
 // The finding's lines as the progress list shows them: a ruler, the object, the section, the key.
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference);
 
-// The report is written even when nothing is found; Findings when something was.
-CommandResult FindEmptyReferences(const std::string& catalogueFolder);
-// The same on the catalogue's bytes, read already; findings is the number of empty keys.
+// The check on the catalogue's bytes; findings is the number of empty keys. The report is written
+// even when nothing is found; Findings when something was.
 CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings);

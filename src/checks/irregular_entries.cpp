@@ -3,7 +3,6 @@
 #include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
 #include "output/app_state.h"
-#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
@@ -91,13 +90,6 @@ std::vector<JudgedLine> JudgeCatalogueLines(const std::string& catalogue, bool k
 
 std::string IrregularEntryLine(const JudgedLine& entry) {
     return "Irregular entry towards object " + std::to_string(entry.objectNumber) + ": " + std::string(entry.line);
-}
-
-CommandResult CheckIrregularEntries(const std::string& catalogueFolder) {
-    std::string catalogue;
-    int findings = 0;
-    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
-    return CheckIrregularEntriesInCatalogue(catalogue, findings);
 }
 
 CommandResult CheckIrregularEntriesInCatalogue(const std::string& catalogue, int& findings) {

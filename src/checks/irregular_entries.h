@@ -20,6 +20,5 @@ std::string_view RegularLinePrefixOf(std::string_view line);
 std::vector<JudgedLine> JudgeCatalogueLines(const std::string& catalogue, bool keepRegular);
 std::string IrregularEntryLine(const JudgedLine& entry);
 
-CommandResult CheckIrregularEntries(const std::string& catalogueFolder);
-// The same on the catalogue's bytes, read already; findings is the number of irregular lines.
+// The check on the catalogue's bytes; findings is the number of irregular lines.
 CommandResult CheckIrregularEntriesInCatalogue(const std::string& catalogue, int& findings);

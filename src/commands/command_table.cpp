@@ -12,11 +12,21 @@
 #include "maps/missing_map_objects.h"
 #include "maps/missing_objects_window.h"
 #include "output/app_state.h"
+#include "output/catalogue_loading.h"
 #include "output/reports.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
 
 namespace {
+
+// A catalogue check as a command: static.ini read whole, then the check on its bytes.
+template <CommandResult (*check)(const std::string&, int&)>
+CommandResult OnCatalogue(const CommandInput& input) {
+    std::string catalogue;
+    int findings = 0;
+    if (!LoadCatalogue(input.catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    return check(catalogue, findings);
+}
 
 CommandResult CheckMissingObjects(const CommandInput& input) {
     if (!input.mapSelection.empty()) return FindMissingMapObjects(input.mapSelection, input.catalogueFolder);
@@ -33,11 +43,11 @@ CommandResult CheckMissingObjectsOfAllMaps(const CommandInput& input) {
 
 const Command CommandRows[] = {
     {MenuDoubledObjects, "doubled-objects", "building headers whose section names occur more than once", true, false,
-     [](const CommandInput& in) { return FindDoubledObjects(in.catalogueFolder); }},
+     OnCatalogue<FindDoubledObjectsInCatalogue>},
     {MenuIrregularEntries, "irregular-entries", "lines that begin with none of the known prefixes", true, false,
-     [](const CommandInput& in) { return CheckIrregularEntries(in.catalogueFolder); }},
+     OnCatalogue<CheckIrregularEntriesInCatalogue>},
     {MenuEmptyReferences, "empty-references", "Mesh, MeshLive and MeshDead lines without a value", true, false,
-     [](const CommandInput& in) { return FindEmptyReferences(in.catalogueFolder); }},
+     OnCatalogue<FindEmptyReferencesInCatalogue>},
     {MenuRenumber, "renumber", "rewrites static.ini with a number line above every building header", true, false,
      [](const CommandInput& in) { return RenumberCatalogue(in.catalogueFolder, Numbering::Renumber); }},
     {MenuDenumber, "denumber", "rewrites static.ini without its number lines", true, false,

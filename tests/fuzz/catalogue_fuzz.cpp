@@ -4,10 +4,8 @@
 #include "fuzz_support.h"
 
 #include "catalogue/catalogue_reader.h"
-#include "checks/doubled_objects.h"
-#include "checks/empty_references.h"
-#include "checks/irregular_entries.h"
 #include "checks/mesh_references.h"
+#include "commands/command_table.h"
 #include "platform/headless/headless.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
@@ -64,9 +62,12 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     }
     Require(!NextPhysicalLine(physical, raw) && !NextCatalogueLine(trimmed, line), "no more lines");
 
-    RequireBaseline(FindDoubledObjects(Scratch), "Doubled_objects.txt", "pairwise");
-    RequireBaseline(CheckIrregularEntries(Scratch), "Irregular_entrys.txt", "prefix-table");
-    RequireBaseline(FindEmptyReferences(Scratch), "Empty_references.txt", "bare-keys",
+    CommandInput inScratch;
+    inScratch.catalogueFolder = Scratch;
+    auto run = [&](const char* command) { return CommandNamed(command)->run(inScratch); };
+    RequireBaseline(run("doubled-objects"), "Doubled_objects.txt", "pairwise");
+    RequireBaseline(run("irregular-entries"), "Irregular_entrys.txt", "prefix-table");
+    RequireBaseline(run("empty-references"), "Empty_references.txt", "bare-keys",
                     "\r\nEmpty reference: ");
     RequireBaseline(CreateMissionBuilderList(Scratch, BuilderList::Fmb), "Static_list_FMB.txt", "entry-list",
                     nullptr);
