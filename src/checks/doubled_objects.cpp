@@ -1,67 +1,143 @@
 #include "checks/doubled_objects.h"
 
-#include "catalogue/catalogue_reader.h"
 #include "catalogue/name_table.h"
 #include "output/app_state.h"
+#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
 
-
-// One pass from the end finds each name's next occurrence, so the pairs come out in the order of
-// the pairwise walk without its square cost.
-std::vector<DoubledObject> PairDoubledNames(const std::vector<std::string_view>& names) {
-    std::vector<int> next(names.size(), -1);
-    NameTable laterOccurrence = NameTableFor(names.size());
-    for (int i = static_cast<int>(names.size()) - 1; i >= 0; --i) {
-        int& slot = NameSlot(laterOccurrence, names, names[i]);
-        next[i] = slot;
-        slot = i;
-    }
-    std::vector<DoubledObject> doubles;
-    for (int i = 0; i < static_cast<int>(names.size()); ++i)
-        if (next[i] >= 0) doubles.push_back({i, next[i], names[i]});
-    return doubles;
-}
-
-std::string DoubledObjectLine(const DoubledObject& doubled) {
-    std::string line = "Double object (" + std::to_string(doubled.firstIndex) + ") => (" +
-                       std::to_string(doubled.secondIndex) + "): ";
-    return line.append(doubled.sectionName);
-}
+#include <vector>
 
 namespace {
 
-void ListObjectsAndDoubles(const std::vector<std::string_view>& names, const std::vector<DoubledObject>& doubles) {
-    const std::string ruler(67, '*');
-    std::size_t nextDouble = 0;
-    for (int i = 0; i < static_cast<int>(names.size()); ++i) {
-        DrainPendingEvents();
-        AddProgressLine("Build (" + std::to_string(i) + ") " + std::string(names[i]));
-        if (nextDouble < doubles.size() && doubles[nextDouble].firstIndex == i) {
-            DrainPendingEvents();
-            AddProgressLine(ruler);
-            AddProgressLine(DoubledObjectLine(doubles[nextDouble++]));
-            AddProgressLine(ruler);
-        }
+// The names of one window of headers, each with its next repetition once known.
+struct Window {
+    std::string bytes;  // reserved once, so the views into it hold
+    std::vector<std::string_view> names;
+    std::vector<int> next;
+    NameTable latest;         // each name's latest place in the window
+    std::size_t waiting = 0;  // names whose latest place has no next yet
+    long long following = 0;  // the index of the next header read
+};
+
+// A header after the window is the next of its name's latest place, when that has none yet.
+void NoteLaterHeader(Window& window, std::string_view name) {
+    int slot = NameSlot(window.latest, window.names, name);
+    if (slot >= 0 && window.next[slot] < 0) {
+        window.next[slot] = static_cast<int>(window.following);
+        --window.waiting;
     }
-    AddProgressLine("");
-    AddProgressLine("Total number of objects: " + std::to_string(names.size()));
+    ++window.following;
+}
+
+// Fills the window from the reader, standing at the window's first header; true when the catalogue
+// ended within it.
+bool FillWindow(LineReader& reader, Window& window, const NameWindow& limits) {
+    std::string_view line;
+    while (NextCatalogueLine(reader, line)) {
+        if (!IsBuildingHeader(line)) continue;
+        std::string_view name = SectionNameByBracket(line);
+        bool full = window.names.size() == limits.names ||
+                    window.bytes.size() + name.size() > window.bytes.capacity();
+        // A window always takes its first name, even one larger than the window.
+        if (full && !window.names.empty()) {
+            NoteLaterHeader(window, name);
+            return false;
+        }
+        std::size_t at = window.bytes.size();
+        window.bytes.append(name);
+        window.names.push_back(std::string_view(window.bytes).substr(at));
+        window.next.push_back(-1);
+        int& slot = NameSlot(window.latest, window.names, window.names.back());
+        if (slot >= 0) window.next[slot] = static_cast<int>(window.following);
+        else ++window.waiting;
+        slot = static_cast<int>(window.names.size()) - 1;
+        ++window.following;
+    }
+    return true;
+}
+
+// Scans the headers after a full window for the repetitions of its latest names.
+void FindLaterRepetitions(LineReader& reader, Window& window) {
+    std::string_view line;
+    while (window.waiting > 0 && NextCatalogueLine(reader, line))
+        if (IsBuildingHeader(line)) NoteLaterHeader(window, SectionNameByBracket(line));
 }
 
 }  // namespace
 
-CommandResult FindDoubledObjectsInCatalogue(const std::string& catalogue, int& findings) {
-    if (ProgressListOn) ClearProgressList();
-    std::vector<std::string_view> names = BuildingSectionNames(catalogue);
-    DrainPendingEvents();
-    std::vector<DoubledObject> doubles = PairDoubledNames(names);
-    if (ProgressListOn) ListObjectsAndDoubles(names, doubles);
+long long PairDoubledNames(const CataloguePass& openPass, NameWindow limits,
+                           const std::function<void(const NamedObject&)>& sink) {
+    long long first = 0;
+    for (;;) {
+        LineReader reader;
+        if (!openPass(reader)) return -1;
+        std::string_view line;
+        for (long long skipped = 0; skipped < first && NextCatalogueLine(reader, line);)
+            skipped += IsBuildingHeader(line);
+        Window window;
+        window.following = first;
+        window.bytes.reserve(limits.nameBytes);
+        window.latest = NameTableFor(limits.names);
+        bool ended = FillWindow(reader, window, limits);
+        if (!ended) FindLaterRepetitions(reader, window);
+        if (reader.ReadFailed()) return -1;
+        // Clicks made while a window was read are dropped, as during every check.
+        DrainPendingEvents();
+        for (std::size_t i = 0; i < window.names.size(); ++i)
+            sink({static_cast<int>(first + static_cast<long long>(i)), window.names[i], window.next[i]});
+        first += static_cast<long long>(window.names.size());
+        if (ended) return first;
+    }
+}
 
-    std::vector<std::string> lines;
-    for (const DoubledObject& doubled : doubles) lines.push_back(DoubledObjectLine(doubled));
-    findings = static_cast<int>(lines.size());
-    return WriteFindingsReport({"Doubled_objects.txt", "Doubled objects in your static.ini:", "No doubled objects",
-                                "No doubled objects found in your static.ini"},
-                               lines);
+std::string DoubledObjectLine(const NamedObject& object) {
+    std::string line = "Double object (" + std::to_string(object.index) + ") => (" + std::to_string(object.next) + "): ";
+    return line.append(object.name);
+}
+
+CommandResult FindDoubledObjects(const std::string& catalogueFolder, int& findings) {
+    findings = 0;
+    LineReader first;
+    if (!OpenCatalogue(catalogueFolder, first, CantOpenCatalogue)) return CommandResult::Failed;
+    if (ProgressListOn) ClearProgressList();
+    const std::string ruler(67, '*');
+    FindingsWriter writer{{"Doubled_objects.txt", "Doubled objects in your static.ini:", "No doubled objects",
+                           "No doubled objects found in your static.ini"}};
+    bool opened = false;
+    // The first pass is the reader opened above; a later one that fails to open is a failed read.
+    CataloguePass openPass = [&](LineReader& reader) {
+        if (!opened) {
+            opened = true;
+            reader = std::move(first);
+            return true;
+        }
+        return OpenLines(catalogueFolder, "static.ini", reader) == FileRead::Whole;
+    };
+    long long objects = PairDoubledNames(openPass, NameWindow(), [&](const NamedObject& object) {
+        if (ProgressListOn) {
+            DrainPendingEvents();
+            AddProgressLine("Build (" + std::to_string(object.index) + ") " + std::string(object.name));
+        }
+        if (object.next < 0) return;
+        std::string line = DoubledObjectLine(object);
+        if (ProgressListOn) {
+            DrainPendingEvents();
+            AddProgressLine(ruler);
+            AddProgressLine(line);
+            AddProgressLine(ruler);
+        }
+        AddFinding(writer, line);
+    });
+    if (objects < 0) {
+        TellCatalogueFailure(FileRead::FailedPartway, {});
+        return FinishFindings(writer, false);
+    }
+    if (ProgressListOn) {
+        AddProgressLine("");
+        AddProgressLine("Total number of objects: " + std::to_string(objects));
+    }
+    findings = writer.findings;
+    return FinishFindings(writer, true);
 }

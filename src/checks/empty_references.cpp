@@ -2,26 +2,26 @@
 
 #include "catalogue/catalogue_reader.h"
 #include "output/app_state.h"
+#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
 
 // Whole-line equality: the key followed by anything but blanks names a mesh, or at least something.
-std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue) {
-    std::vector<EmptyReference> found;
+void FindEmptyReferenceLines(LineReader& catalogue, const std::function<void(const EmptyReference&)>& sink) {
     EmptyReference reference;
-    LineReader reader = LinesOf(catalogue);
+    std::string sectionName;  // the line it was cut from is gone by the time a key follows
     std::string_view line;
-    while (NextCatalogueLine(reader, line)) {
+    while (NextCatalogueLine(catalogue, line)) {
         if (IsBuildingHeader(line)) {
             ++reference.objectNumber;
-            reference.sectionName = SectionNameByEnds(line);
+            sectionName = SectionNameByEnds(line);
         } else if (line == "Mesh" || line == "MeshLive" || line == "MeshDead") {
+            reference.sectionName = sectionName;
             reference.key = line;
-            found.push_back(reference);
+            sink(reference);
         }
     }
-    return found;
 }
 
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
@@ -29,9 +29,11 @@ std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference) {
             std::string(reference.sectionName), "Empty reference: " + std::string(reference.key)};
 }
 
-CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings) {
+CommandResult FindEmptyReferences(const std::string& catalogueFolder, int& findings) {
     const std::string nothingFound = "No empty references found in your static.ini";
     findings = 0;
+    LineReader catalogue;
+    if (!OpenCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
     if (ProgressListOn) {
         ClearProgressList();
         AddProgressLine("Empty references in your Static.ini");
@@ -42,9 +44,8 @@ CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& 
     WriteReportLine(report, "Empty references in your static.ini");
     WriteReportLine(report, "");
 
-    std::vector<EmptyReference> found = FindEmptyReferenceLines(catalogue);
-    findings = static_cast<int>(found.size());
-    for (const EmptyReference& reference : found) {
+    FindEmptyReferenceLines(catalogue, [&](const EmptyReference& reference) {
+        ++findings;
         std::vector<std::string> lines = EmptyReferenceLines(reference);
         if (ProgressListOn) {
             DrainPendingEvents();
@@ -54,11 +55,15 @@ CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& 
         // finding before them.
         for (std::size_t i = reference.key == "Mesh" ? 0 : 1; i < lines.size(); ++i)
             WriteReportLine(report, lines[i]);
+    });
+    if (!ReadToTheEnd(catalogue)) {
+        DiscardReport(report);
+        return CommandResult::Failed;
     }
-    if (found.empty()) {
+    if (findings == 0) {
         if (ProgressListOn) AddProgressLine(nothingFound);
         WriteReportText(report, nothingFound);
     }
     if (!FinishReport(report)) return CommandResult::Failed;
-    return found.empty() ? CommandResult::NothingFound : CommandResult::Findings;
+    return findings == 0 ? CommandResult::NothingFound : CommandResult::Findings;
 }

@@ -3,6 +3,9 @@
 
 #include "output/command_result.h"
 
+#include "catalogue/catalogue_reader.h"
+
+#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -13,11 +16,12 @@ struct EmptyReference {
     std::string_view key;
 };
 
-// Every mesh key that stands alone on its line, in file order.
-std::vector<EmptyReference> FindEmptyReferenceLines(const std::string& catalogue);
+// Gives every mesh key that stands alone on its line to the sink, in file order; the views hold
+// while the sink has them.
+void FindEmptyReferenceLines(LineReader& catalogue, const std::function<void(const EmptyReference&)>& sink);
 // The finding's lines as the progress list shows them: a ruler, the object, the section, the key.
 std::vector<std::string> EmptyReferenceLines(const EmptyReference& reference);
 
-// The check on the catalogue's bytes; findings is the number of empty keys. The report is written
+// The check on static.ini in the folder; findings is the number of empty keys. The report is written
 // even when nothing is found; Findings when something was.
-CommandResult FindEmptyReferencesInCatalogue(const std::string& catalogue, int& findings);
+CommandResult FindEmptyReferences(const std::string& catalogueFolder, int& findings);

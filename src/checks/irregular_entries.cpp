@@ -3,6 +3,7 @@
 #include "catalogue/catalogue_reader.h"
 #include "catalogue/text.h"
 #include "output/app_state.h"
+#include "output/catalogue_loading.h"
 #include "output/messages.h"
 #include "output/progress_list.h"
 #include "output/reports.h"
@@ -37,24 +38,18 @@ const std::string_view RegularLinePrefixes[] = {
     "[buildings.Mountain$",
 };
 
-void ListJudgedLines(const std::vector<JudgedLine>& judged) {
-    const std::string ruler(41, '*');
-    std::size_t regular = 0;
-    for (const JudgedLine& entry : judged) {
-        DrainPendingEvents();
-        if (!entry.prefix.empty()) {
-            ++regular;
-            AddProgressLine("Reg: " + std::string(entry.prefix) + " => " + std::string(entry.line));
-            continue;
-        }
-        AddProgressLine(ruler);
-        AddProgressLine("Irregular entry towards object (" + std::to_string(entry.objectNumber) +
-                        "): " + std::string(entry.line));
-        AddProgressLine(ruler);
+const std::string IrregularRuler(41, '*');
+
+void ListJudgedLine(const JudgedLine& entry) {
+    DrainPendingEvents();
+    if (!entry.prefix.empty()) {
+        AddProgressLine("Reg: " + std::string(entry.prefix) + " => " + std::string(entry.line));
+        return;
     }
-    AddProgressLine(" ");
-    AddProgressLine("Regular lines: " + std::to_string(regular));
-    AddProgressLine("Irregular lines: " + std::to_string(judged.size() - regular));
+    AddProgressLine(IrregularRuler);
+    AddProgressLine("Irregular entry towards object (" + std::to_string(entry.objectNumber) +
+                    "): " + std::string(entry.line));
+    AddProgressLine(IrregularRuler);
 }
 
 }  // namespace
@@ -74,34 +69,40 @@ std::string_view RegularLinePrefixOf(std::string_view line) {
     return {};
 }
 
-std::vector<JudgedLine> JudgeCatalogueLines(const std::string& catalogue, bool keepRegular) {
-    std::vector<JudgedLine> judged;
+void JudgeCatalogueLines(LineReader& catalogue, bool keepRegular, const std::function<void(const JudgedLine&)>& sink) {
     int objectNumber = 0;
-    LineReader reader = LinesOf(catalogue);
     std::string_view line;
-    while (NextCatalogueLine(reader, line)) {
+    while (NextCatalogueLine(catalogue, line)) {
         // Five characters, one more than a building header needs: "[bui" alone opens no entry here.
         if (StartsWith(line, "[buil")) ++objectNumber;
         std::string_view prefix = RegularLinePrefixOf(line);
-        if (prefix.empty() ? !line.empty() : keepRegular) judged.push_back({objectNumber, prefix, line});
+        if (prefix.empty() ? !line.empty() : keepRegular) sink({objectNumber, prefix, line});
     }
-    return judged;
 }
 
 std::string IrregularEntryLine(const JudgedLine& entry) {
     return "Irregular entry towards object " + std::to_string(entry.objectNumber) + ": " + std::string(entry.line);
 }
 
-CommandResult CheckIrregularEntriesInCatalogue(const std::string& catalogue, int& findings) {
+CommandResult CheckIrregularEntries(const std::string& catalogueFolder, int& findings) {
+    findings = 0;
+    LineReader catalogue;
+    if (!OpenCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
     if (ProgressListOn) ClearProgressList();
-    std::vector<JudgedLine> judged = JudgeCatalogueLines(catalogue, ProgressListOn);
-    if (ProgressListOn) ListJudgedLines(judged);
-
-    std::vector<std::string> lines;
-    for (const JudgedLine& entry : judged)
-        if (entry.prefix.empty()) lines.push_back(IrregularEntryLine(entry));
-    findings = static_cast<int>(lines.size());
-    return WriteFindingsReport({"Irregular_entrys.txt", "Irregular entrys in your static.ini:", "No irregular objects",
-                                "No irregular objects found in your static.ini"},
-                               lines);
+    FindingsWriter writer{{"Irregular_entrys.txt", "Irregular entrys in your static.ini:", "No irregular objects",
+                           "No irregular objects found in your static.ini"}};
+    long long judged = 0;
+    JudgeCatalogueLines(catalogue, ProgressListOn, [&](const JudgedLine& entry) {
+        ++judged;
+        if (ProgressListOn) ListJudgedLine(entry);
+        if (entry.prefix.empty()) AddFinding(writer, IrregularEntryLine(entry));
+    });
+    bool whole = ReadToTheEnd(catalogue);
+    if (ProgressListOn && whole) {
+        AddProgressLine(" ");
+        AddProgressLine("Regular lines: " + std::to_string(judged - writer.findings));
+        AddProgressLine("Irregular lines: " + std::to_string(writer.findings));
+    }
+    findings = writer.findings;
+    return FinishFindings(writer, whole);
 }

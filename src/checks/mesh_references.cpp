@@ -154,24 +154,24 @@ bool CutMeshValue(std::string_view line, std::string& value) {
     return true;
 }
 
-std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue) {
+std::vector<MeshIndexEntry> BuildMeshIndex(LineReader& reader) {
     std::vector<MeshIndexEntry> index;
-    LineReader reader = LinesOf(catalogue);
-    std::string_view line, title;
+    std::string_view line;
+    std::string title;
     bool grouped = false;
     while (!grouped && NextCatalogueLine(reader, line)) grouped = line == GroupMarker;
     // Only the first group's title line keeps its blanks; every later one is trimmed.
-    if (grouped) NextPhysicalLine(reader, title);
+    if (grouped && NextPhysicalLine(reader, line)) title = line;
     while (grouped && NextCatalogueLine(reader, line)) {
         // Markers and headers begin with "[", mesh keys with "M": most lines of a big catalogue
         // are passed over at their first byte.
         if (line.empty() || (line[0] != '[' && line[0] != 'M')) continue;
         if (line == GroupMarker) {
-            if (!NextCatalogueLine(reader, title)) title = {};
+            title = NextCatalogueLine(reader, line) ? line : std::string_view();
         } else if (IsBuildingHeader(line)) {
             MeshIndexEntry entry;
             entry.title = title;
-            entry.sectionName = SectionNameByEnds(line);
+            entry.sectionName = std::string(SectionNameByEnds(line));
             entry.number = static_cast<int>(index.size());
             index.push_back(std::move(entry));
         } else if (index.empty()) {
@@ -264,19 +264,34 @@ int CountMeshFindings(const std::vector<MeshIndexEntry>& index, MeshCheck check)
     return findings;
 }
 
-CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogue, const std::string& modsRoot,
-                            MeshCheck check, SharedMeshIndex& shared, int& findings) {
-    const bool missingMode = check == MeshCheck::MissingMeshes;
-    if (!shared.made) {
-        shared.entries = BuildMeshIndex(catalogue);
-        ExcludeStandardTitles(shared.entries, [&shared](const std::string& line) {
-            AddProgressLine(line);
-            shared.progressLines.push_back(line);
-        });
-        shared.made = true;
-    } else if (ProgressListOn) {
-        for (const std::string& line : shared.progressLines) AddProgressLine(line);
+// The run's index, read from the catalogue unless an earlier check of the run made it; false, with
+// the Wait window closed and the user told, when the catalogue could not be read whole.
+bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, SharedMeshIndex& shared) {
+    if (shared.made) {
+        if (ProgressListOn)
+            for (const std::string& line : shared.progressLines) AddProgressLine(line);
+        return true;
     }
+    LineReader catalogue;
+    FileRead read = OpenLines(catalogueFolder, "static.ini", catalogue);
+    if (read == FileRead::Whole) shared.entries = BuildMeshIndex(catalogue);
+    if (read == FileRead::Whole && catalogue.ReadFailed()) read = FileRead::FailedPartway;
+    if (read != FileRead::Whole) {
+        CloseTopWindow(run.waitWindow);
+        TellCatalogueFailure(read, CantOpenCatalogue);
+        return false;
+    }
+    ExcludeStandardTitles(shared.entries, [&shared](const std::string& line) {
+        AddProgressLine(line);
+        shared.progressLines.push_back(line);
+    });
+    shared.made = true;
+    return true;
+}
+
+CommandResult FinishMeshRun(const MeshRun& run, const std::string& modsRoot, MeshCheck check,
+                            SharedMeshIndex& shared, int& findings) {
+    const bool missingMode = check == MeshCheck::MissingMeshes;
     std::vector<MeshIndexEntry>& index = shared.entries;
     if (ProgressListOn) {
         DrainPendingEvents();
@@ -312,21 +327,15 @@ CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogue, co
 }  // namespace
 
 CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
-    MeshRun run = StartMeshRun();
-    std::string catalogue;
-    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
-    if (read != FileRead::Whole) {
-        CloseTopWindow(run.waitWindow);
-        TellCatalogueFailure(read, CantOpenCatalogue);
-        return CommandResult::Failed;
-    }
     int findings = 0;
     SharedMeshIndex index;
-    return FinishMeshRun(run, catalogue, modsRoot, check, index, findings);
+    return CheckMeshReferencesSharing(catalogueFolder, modsRoot, check, index, findings);
 }
 
-CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
-                                             SharedMeshIndex& index, int& findings) {
+CommandResult CheckMeshReferencesSharing(const std::string& catalogueFolder, const std::string& modsRoot,
+                                         MeshCheck check, SharedMeshIndex& index, int& findings) {
     findings = 0;
-    return FinishMeshRun(StartMeshRun(), catalogue, modsRoot, check, index, findings);
+    MeshRun run = StartMeshRun();
+    if (!MakeMeshIndex(run, catalogueFolder, index)) return CommandResult::Failed;
+    return FinishMeshRun(run, modsRoot, check, index, findings);
 }

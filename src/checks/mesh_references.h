@@ -3,6 +3,7 @@
 // read the catalogue into one index of entries.
 #pragma once
 
+#include "catalogue/catalogue_reader.h"
 #include "output/command_result.h"
 #include "output/progress_list.h"
 
@@ -12,8 +13,8 @@
 #include <vector>
 
 struct MeshIndexEntry {
-    std::string_view title;        // the title line of the entry's group; "" once excluded
-    std::string_view sectionName;  // end cut of the building header
+    std::string title;        // the title line of the entry's group; "" once excluded
+    std::string sectionName;  // end cut of the building header
     int number = 0;           // ordinal among the headers after the first group marker
     std::string mesh;         // "Mesh " value from its first "3do", "/" turned into "\"; "" when unset
     std::string meshLive;
@@ -39,8 +40,8 @@ bool CutMeshValue(std::string_view line, std::string& value);
 
 using LineSink = std::function<void(const std::string&)>;
 
-// One entry per building header after the first group marker; its views point into the catalogue.
-std::vector<MeshIndexEntry> BuildMeshIndex(const std::string& catalogue);
+// One entry per building header after the first group marker.
+std::vector<MeshIndexEntry> BuildMeshIndex(LineReader& catalogue);
 // Empties the title of every entry in a standard title group; later steps pass over such entries.
 // While the progress list is on, the steps go to the sink.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add = AddProgressLine);
@@ -62,7 +63,7 @@ struct SharedMeshIndex {
     std::vector<MeshIndexEntry> entries;
     std::vector<std::string> progressLines;  // making it gave these; the second check shows them again
 };
-// The same on the catalogue's bytes, read already; findings is the number of missing meshes, or of
-// entries whose live and dead meshes are one file.
-CommandResult CheckMeshReferencesInCatalogue(const std::string& catalogue, const std::string& modsRoot, MeshCheck check,
-                                             SharedMeshIndex& index, int& findings);
+// The same with the index of an earlier check of the run; findings is the number of missing meshes,
+// or of entries whose live and dead meshes are one file.
+CommandResult CheckMeshReferencesSharing(const std::string& catalogueFolder, const std::string& modsRoot,
+                                         MeshCheck check, SharedMeshIndex& index, int& findings);

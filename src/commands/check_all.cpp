@@ -11,46 +11,40 @@
 
 namespace {
 
-// What the steps of one run share: the catalogue's bytes and the mesh index.
-struct SharedRead {
-    std::string catalogue;
-    SharedMeshIndex meshIndex;
-};
-
 struct CheckStep {
     const char* name;    // as verrant-cli names the single command
     const char* report;  // the report the single command writes
-    CommandResult (*run)(SharedRead& read, const CommandInput& input, int& findings);
+    CommandResult (*run)(const CommandInput& input, SharedMeshIndex& meshIndex, int& findings);
 };
 
 // The order a builder reads them in: the catalogue's own faults first, then its meshes, then maps.
 const CheckStep Steps[] = {
     {"doubled-objects", "Doubled_objects.txt",
-     [](SharedRead& read, const CommandInput&, int& findings) {
-         return FindDoubledObjectsInCatalogue(read.catalogue, findings);
+     [](const CommandInput& input, SharedMeshIndex&, int& findings) {
+         return FindDoubledObjects(input.catalogueFolder, findings);
      }},
     {"irregular-entries", "Irregular_entrys.txt",
-     [](SharedRead& read, const CommandInput&, int& findings) {
-         return CheckIrregularEntriesInCatalogue(read.catalogue, findings);
+     [](const CommandInput& input, SharedMeshIndex&, int& findings) {
+         return CheckIrregularEntries(input.catalogueFolder, findings);
      }},
     {"empty-references", "Empty_references.txt",
-     [](SharedRead& read, const CommandInput&, int& findings) {
-         return FindEmptyReferencesInCatalogue(read.catalogue, findings);
+     [](const CommandInput& input, SharedMeshIndex&, int& findings) {
+         return FindEmptyReferences(input.catalogueFolder, findings);
      }},
     {"wrong-sim-references", "Missing_3do.txt",
-     [](SharedRead& read, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot, MeshCheck::MissingMeshes,
-                                               read.meshIndex, findings);
+     [](const CommandInput& input, SharedMeshIndex& meshIndex, int& findings) {
+         return CheckMeshReferencesSharing(input.catalogueFolder, input.modsRoot, MeshCheck::MissingMeshes,
+                                           meshIndex, findings);
      }},
     {"doubled-used-sims", "Doubled_sims_or_meshes.txt",
-     [](SharedRead& read, const CommandInput& input, int& findings) {
-         return CheckMeshReferencesInCatalogue(read.catalogue, input.modsRoot,
-                                               MeshCheck::SharedLiveDeadMeshes, read.meshIndex, findings);
+     [](const CommandInput& input, SharedMeshIndex& meshIndex, int& findings) {
+         return CheckMeshReferencesSharing(input.catalogueFolder, input.modsRoot, MeshCheck::SharedLiveDeadMeshes,
+                                           meshIndex, findings);
      }},
     {"missing-objects --all-maps", "Missing_objects_all_maps.txt",
-     [](SharedRead& read, const CommandInput& input, int& findings) {
+     [](const CommandInput& input, SharedMeshIndex&, int& findings) {
          AllMapsCount count;
-         CommandResult result = FindMissingObjectsOfAllMaps(read.catalogue, input.mapsFolder, count);
+         CommandResult result = CheckAllMaps(input.catalogueFolder, input.mapsFolder, count);
          findings = count.namesMissing + count.notMaps;
          return result;
      }},
@@ -66,14 +60,16 @@ std::string SummaryLine(const std::string& name, const std::string& count, const
 }  // namespace
 
 CommandResult CheckAll(const CommandInput& input) {
-    SharedRead shared;
-    bool read = LoadCatalogue(input.catalogueFolder, shared.catalogue, CantOpenCatalogue);
+    // Each check reads the catalogue on its own, a block at a time; one that does not read whole is
+    // told of once, here, rather than by every check.
+    SharedMeshIndex meshIndex;
+    bool read = CatalogueReadsWhole(input.catalogueFolder, CantOpenCatalogue);
     bool failed = !read, found = false;
     int total = 0;
     std::vector<std::string> lines;
     for (const CheckStep& step : Steps) {
         int findings = 0;
-        CommandResult result = read ? step.run(shared, input, findings) : CommandResult::Failed;
+        CommandResult result = read ? step.run(input, meshIndex, findings) : CommandResult::Failed;
         if (result == CommandResult::Failed) {
             failed = true;
             lines.push_back(SummaryLine(step.name, "-", "could not run"));

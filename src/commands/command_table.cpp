@@ -12,20 +12,17 @@
 #include "maps/missing_map_objects.h"
 #include "maps/missing_objects_window.h"
 #include "output/app_state.h"
-#include "output/catalogue_loading.h"
 #include "output/reports.h"
 #include "rewrite/mission_builder_list.h"
 #include "rewrite/renumbering.h"
 
 namespace {
 
-// A catalogue check as a command: static.ini read whole, then the check on its bytes.
+// A catalogue check as a command, its count of findings left to check-all.
 template <CommandResult (*check)(const std::string&, int&)>
 CommandResult OnCatalogue(const CommandInput& input) {
-    std::string catalogue;
     int findings = 0;
-    if (!LoadCatalogue(input.catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
-    return check(catalogue, findings);
+    return check(input.catalogueFolder, findings);
 }
 
 CommandResult CheckMissingObjects(const CommandInput& input) {
@@ -43,11 +40,11 @@ CommandResult CheckMissingObjectsOfAllMaps(const CommandInput& input) {
 
 const Command CommandRows[] = {
     {MenuDoubledObjects, "doubled-objects", "building headers whose section names occur more than once", true, false,
-     OnCatalogue<FindDoubledObjectsInCatalogue>},
+     OnCatalogue<FindDoubledObjects>},
     {MenuIrregularEntries, "irregular-entries", "lines that begin with none of the known prefixes", true, false,
-     OnCatalogue<CheckIrregularEntriesInCatalogue>},
+     OnCatalogue<CheckIrregularEntries>},
     {MenuEmptyReferences, "empty-references", "Mesh, MeshLive and MeshDead lines without a value", true, false,
-     OnCatalogue<FindEmptyReferencesInCatalogue>},
+     OnCatalogue<FindEmptyReferences>},
     {MenuRenumber, "renumber", "rewrites static.ini with a number line above every building header", true, false,
      [](const CommandInput& in) { return RenumberCatalogue(in.catalogueFolder, Numbering::Renumber); }},
     {MenuDenumber, "denumber", "rewrites static.ini without its number lines", true, false,

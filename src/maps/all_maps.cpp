@@ -87,12 +87,17 @@ std::string AllMapsSummary(const AllMapsCount& count) {
            std::to_string(count.notMaps) + " not map files";
 }
 
-CommandResult FindMissingObjectsOfAllMaps(const std::string& catalogue, const std::string& mapsFolder,
-                                          AllMapsCount& count) {
+CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
+                           AllMapsCount& count) {
     count = AllMapsCount();
+    LineReader catalogue;
+    if (!OpenCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
+    SectionNames sections;
+    ReadSectionNames(catalogue, sections);
+    if (!ReadToTheEnd(catalogue)) return CommandResult::Failed;
     std::vector<std::string> mapFiles;
     if (!FindMapFiles(mapsFolder, mapFiles)) return CommandResult::Failed;
-    std::vector<std::string_view> sectionNames = BuildingSectionNames(catalogue);
+    const std::vector<std::string_view>& sectionNames = sections.names;
     NameTable defined = NameTableFor(sectionNames.size());
     for (std::size_t i = 0; i < sectionNames.size(); ++i) {
         int& slot = NameSlot(defined, sectionNames, sectionNames[i]);
@@ -128,12 +133,4 @@ CommandResult FindMissingObjectsOfAllMaps(const std::string& catalogue, const st
         return CommandResult::NothingFound;
     }
     return WriteAllMapsReport(maps, notMaps);
-}
-
-CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
-                           AllMapsCount& count) {
-    count = AllMapsCount();
-    std::string catalogue;
-    if (!LoadCatalogue(catalogueFolder, catalogue, CantOpenCatalogue)) return CommandResult::Failed;
-    return FindMissingObjectsOfAllMaps(catalogue, mapsFolder, count);
 }

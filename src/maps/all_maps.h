@@ -22,11 +22,8 @@ bool FindMapFiles(const std::string& mapsFolder, std::vector<std::string>& mapFi
 // "N maps checked, M with missing objects, K names missing, F not map files"
 std::string AllMapsSummary(const AllMapsCount& count);
 
-// Checks every map file below the maps folder against the catalogue's bytes and writes
+// Checks every map file below the maps folder against static.ini in the catalogue folder and writes
 // Missing_objects_all_maps.txt. A maps folder that cannot be listed fails without a word: the
 // caller knows where it looked.
-CommandResult FindMissingObjectsOfAllMaps(const std::string& catalogue, const std::string& mapsFolder,
-                                          AllMapsCount& count);
-// The same after reading static.ini in the catalogue folder.
 CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
                            AllMapsCount& count);

@@ -10,21 +10,24 @@
 #include "output/reports.h"
 
 
-// One index of first ordinals gives the numbers of a walk from the first header, without
-// walking the headers once per name.
-std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames,
-                                      const std::vector<std::string_view>& sectionNames) {
-    NameTable firstOrdinal = NameTableFor(sectionNames.size());
-    for (std::size_t i = 0; i < sectionNames.size(); ++i) {
-        int& slot = NameSlot(firstOrdinal, sectionNames, sectionNames[i]);
+// The map's names in one table, each with the first ordinal met in a walk over the headers.
+std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames, LineReader& catalogue) {
+    std::vector<std::string_view> names(mapNames.begin(), mapNames.end());
+    std::vector<int> firstOrdinal(names.size(), NotInCatalogue);
+    NameTable place = NameTableFor(names.size());
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        int& slot = NameSlot(place, names, names[i]);
         if (slot < 0) slot = static_cast<int>(i);
     }
+    int ordinal = 0;
+    ForEachBuildingSectionName(catalogue, [&](std::string_view name) {
+        int slot = NameSlot(place, names, name);
+        if (slot >= 0 && firstOrdinal[slot] == NotInCatalogue) firstOrdinal[slot] = ordinal;
+        ++ordinal;
+    });
     std::vector<int> ordinals;
-    ordinals.reserve(mapNames.size());
-    for (const std::string& name : mapNames) {
-        int slot = NameSlot(firstOrdinal, sectionNames, name);
-        ordinals.push_back(slot < 0 ? NotInCatalogue : slot);
-    }
+    ordinals.reserve(names.size());
+    for (std::string_view name : names) ordinals.push_back(firstOrdinal[NameSlot(place, names, name)]);
     return ordinals;
 }
 
@@ -34,13 +37,13 @@ CommandResult FindMissingMapObjects(const std::string& selection, const std::str
     std::vector<std::string> mapNames = ExtractMapObjectNames(ReadMapFileText(folder, fileName));
     DrainPendingEvents();
 
-    std::string catalogue;
-    if (!LoadCatalogue(catalogueFolder, catalogue, {})) return CommandResult::Failed;
-    std::vector<std::string_view> sectionNames = BuildingSectionNames(catalogue);
+    LineReader catalogue;
+    if (!OpenCatalogue(catalogueFolder, catalogue, {})) return CommandResult::Failed;
+    std::vector<int> ordinals = FirstSectionOrdinals(mapNames, catalogue);
+    if (!ReadToTheEnd(catalogue)) return CommandResult::Failed;
     DrainPendingEvents();
     if (ProgressListOn) ClearProgressList();
 
-    std::vector<int> ordinals = FirstSectionOrdinals(mapNames, sectionNames);
     std::vector<std::string> missing;
     for (std::size_t i = 0; i < mapNames.size(); ++i) {
         if (ordinals[i] != NotInCatalogue && ProgressListOn) {

@@ -9,9 +9,23 @@ void TellCatalogueFailure(FileRead read, const CatalogueOpenFailure& notOpened) 
         ShowMessage(notOpened.title, notOpened.text);
 }
 
-bool LoadCatalogue(const std::string& folder, std::string& catalogue, const CatalogueOpenFailure& notOpened) {
-    FileRead read = ReadWholeFile(folder, "static.ini", catalogue);
+bool OpenCatalogue(const std::string& folder, LineReader& catalogue, const CatalogueOpenFailure& notOpened) {
+    FileRead read = OpenLines(folder, "static.ini", catalogue);
     if (read == FileRead::Whole) return true;
     TellCatalogueFailure(read, notOpened);
     return false;
+}
+
+bool ReadToTheEnd(const LineReader& catalogue) {
+    if (!catalogue.ReadFailed()) return true;
+    TellCatalogueFailure(FileRead::FailedPartway, {});
+    return false;
+}
+
+bool CatalogueReadsWhole(const std::string& folder, const CatalogueOpenFailure& notOpened) {
+    LineReader catalogue;
+    if (!OpenCatalogue(folder, catalogue, notOpened)) return false;
+    std::string_view line;
+    while (NextPhysicalLine(catalogue, line)) {}
+    return ReadToTheEnd(catalogue);
 }

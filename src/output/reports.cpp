@@ -7,31 +7,31 @@ namespace {
 
 const std::size_t ReportBlockSize = 1 << 16;
 
-void TellReportFailure(const std::string& fileName) { ShowMessage("Report failure", "Can't write " + fileName); }
-
 }  // namespace
 
-bool CreateReport(const std::string& fileName, ReportFile& report) {
+void TellReportFailure(const std::string& fileName) { ShowMessage("Report failure", "Can't write " + fileName); }
+
+bool CreateReportSilently(const std::string& fileName, ReportFile& report) {
     report = ReportFile();
     report.fileName = fileName;
     std::string folder = GetReportFolder();
     // Without a desktop the report goes to the current folder of the moment.
-    if (!folder.empty() && !MakeFolderCurrent(folder)) {
-        TellReportFailure(fileName);
-        return false;
-    }
+    if (!folder.empty() && !MakeFolderCurrent(folder)) return false;
     report.path = folder.empty() ? CurrentFolder() : folder;
     if (!report.path.empty() && report.path.back() != '\\') report.path += '\\';
     report.path += fileName;
     report.file = CreateForWriting(fileName);
-    if (report.file == 0) {
-        TellReportFailure(fileName);
-        return false;
-    }
-    return true;
+    return report.file != 0;
+}
+
+bool CreateReport(const std::string& fileName, ReportFile& report) {
+    if (CreateReportSilently(fileName, report)) return true;
+    TellReportFailure(fileName);
+    return false;
 }
 
 void WriteReportLine(ReportFile& report, std::string_view line) {
+    if (report.file == 0) return;
     WriteReportText(report, line);
     report.pending += "\r\n";
 }
@@ -63,17 +63,42 @@ bool FinishReport(ReportFile& report) {
     return true;
 }
 
+void DiscardReport(ReportFile& report) {
+    if (report.file == 0) return;
+    CloseFile(report.file);
+    report.file = 0;
+    RemoveFile(report.path);
+}
+
 CommandResult WriteFindingsReport(const FindingsReport& shape, const std::vector<std::string>& findings) {
-    if (findings.empty()) {
-        ShowMessage(shape.noneTitle, shape.noneText);
+    FindingsWriter writer{shape};
+    for (const std::string& finding : findings) AddFinding(writer, finding);
+    return FinishFindings(writer, true);
+}
+
+void AddFinding(FindingsWriter& writer, std::string_view finding) {
+    if (writer.findings++ == 0) {
+        writer.notCreated = !CreateReportSilently(writer.shape.fileName, writer.report);
+        WriteReportLine(writer.report, writer.shape.heading);
+        WriteReportLine(writer.report, "");
+    }
+    WriteReportLine(writer.report, finding);
+}
+
+CommandResult FinishFindings(FindingsWriter& writer, bool readWhole) {
+    if (!readWhole) {
+        DiscardReport(writer.report);
+        return CommandResult::Failed;
+    }
+    if (writer.findings == 0) {
+        ShowMessage(writer.shape.noneTitle, writer.shape.noneText);
         return CommandResult::NothingFound;
     }
-    ReportFile report;
-    if (!CreateReport(shape.fileName, report)) return CommandResult::Failed;
-    WriteReportLine(report, shape.heading);
-    WriteReportLine(report, "");
-    for (const std::string& finding : findings) WriteReportLine(report, finding);
-    return FinishReport(report) ? CommandResult::Findings : CommandResult::Failed;
+    if (writer.notCreated) {
+        TellReportFailure(writer.shape.fileName);
+        return CommandResult::Failed;
+    }
+    return FinishReport(writer.report) ? CommandResult::Findings : CommandResult::Failed;
 }
 
 void OpenReportInViewer(const std::string& fileName) { StartTextViewer(fileName, GetReportFolder()); }

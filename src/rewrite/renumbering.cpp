@@ -15,20 +15,41 @@ namespace {
 const char* const TemporaryName = "static.ini.tmp";
 const char* const CantWriteTemporary = "Can't write static.ini.tmp";
 
-// The numbering as the progress list shows it, from the text written: every number line there is
-// one the rewrite put in.
-void ShowNumbering(const std::string& written) {
-    LineReader reader = LinesOf(written);
+// The numbering as the progress list shows it, from a second read of the catalogue: the text
+// written holds its lines less the old number lines, and a new one above each header. False when
+// the catalogue could not be read whole.
+bool ShowNumbering(const std::string& catalogueFolder) {
+    LineReader catalogue;
+    if (OpenLines(catalogueFolder, "static.ini", catalogue) != FileRead::Whole) return false;
+    long long number = 0;
     std::string_view line;
-    while (NextPhysicalLine(reader, line)) {
-        if (IsNumberLine(line)) {
+    while (NextPhysicalLine(catalogue, line)) {
+        if (IsNumberLine(line)) continue;
+        if (IsBuildingHeader(line)) {
             DrainOnePendingEvent();
-            AddProgressLine("Add => " + std::string(line));
-        } else {
-            AddProgressLine(std::string(line));
+            AddProgressLine("Add => " + NumberInParentheses(number++));
         }
+        AddProgressLine(std::string(line));
     }
+    return !catalogue.ReadFailed();
 }
+
+// Writes the replacement a large block at a time; a write that failed stops the writing, not the
+// pass, so that the progress list still shows every line.
+struct ReplacementWriter {
+    Handle file = 0;
+    std::string pending;
+    bool failed = false;
+
+    void Write(std::string_view text) {
+        pending.append(text);
+        if (pending.size() >= (1 << 16)) Flush();
+    }
+    void Flush() {
+        if (!failed && !pending.empty() && !WriteBytes(file, pending.data(), pending.size())) failed = true;
+        pending.clear();
+    }
+};
 
 // While the catalogue is claimed no live run writes a static.ini.tmp beside it: one that is there
 // was left by a run that died, and goes, unless it is a link or anything else the rewrite never
@@ -41,24 +62,33 @@ Handle CreateTemporaryFile(Handle claim, const std::string& temporary) {
 
 // The claimed catalogue rewritten through static.ini.tmp; what went wrong, or "" when it is done.
 std::string RewriteClaimedCatalogue(const std::string& catalogueFolder, Numbering numbering, Handle claim) {
-    std::string catalogue;
-    FileRead read = ReadWholeFile(catalogueFolder, "static.ini", catalogue);
-    if (read != FileRead::Whole)
-        return read == FileRead::NotOpened ? CantOpenToRewrite.text : CantReadCatalogue.text;
-    if (!IsTextCatalogue(catalogue)) return "static.ini is not a text file";
+    LineReader catalogue;
+    if (OpenLines(catalogueFolder, "static.ini", catalogue) != FileRead::Whole) return CantOpenToRewrite.text;
+    std::string_view firstBlock = catalogue.Ahead(4096);
+    if (catalogue.ReadFailed()) return CantReadCatalogue.text;
+    if (!IsTextCatalogue(firstBlock)) return "static.ini is not a text file";
     const std::string temporary = catalogueFolder + TemporaryName;
-    Handle file = CreateTemporaryFile(claim, temporary);
-    if (file == 0) return CantWriteTemporary;
-    std::string text = RewrittenCatalogue(catalogue, numbering);
-    if (!WriteBytes(file, text.data(), text.size()) || !FlushToDisk(file)) {
-        CloseFile(file);
-        RemoveFile(temporary);
-        return CantWriteTemporary;
+    ReplacementWriter writer;
+    writer.file = CreateTemporaryFile(claim, temporary);
+    if (writer.file == 0) return CantWriteTemporary;
+    RewriteCatalogue(catalogue, numbering, [&writer](std::string_view text) { writer.Write(text); });
+    writer.Flush();
+    std::string failure;
+    if (catalogue.ReadFailed())
+        failure = CantReadCatalogue.text;
+    else if (writer.failed || !FlushToDisk(writer.file))
+        failure = CantWriteTemporary;
+    else if (numbering == Numbering::Renumber && ProgressListOn && !ShowNumbering(catalogueFolder))
+        failure = CantReadCatalogue.text;
+    if (!failure.empty()) {
+        CloseFile(writer.file);
+    } else if (ReplaceClaimedFile(claim, writer.file)) {
+        return "";
+    } else {
+        failure = "Can't replace static.ini";  // the attempt closed the replacement
     }
-    if (numbering == Numbering::Renumber && ProgressListOn) ShowNumbering(text);
-    if (ReplaceClaimedFile(claim, file)) return "";
     RemoveFile(temporary);
-    return "Can't replace static.ini";
+    return failure;
 }
 
 }  // namespace
@@ -72,13 +102,10 @@ bool IsNumberLine(std::string_view line) {
 }
 
 // The progress list shows this pass as the denumbering.
-std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering) {
-    std::string text;
-    text.reserve(catalogue.size() + catalogue.size() / 8);
+void RewriteCatalogue(LineReader& catalogue, Numbering numbering, const std::function<void(std::string_view)>& sink) {
     long long number = 0;
-    LineReader reader = LinesOf(catalogue);
     std::string_view line;
-    while (NextPhysicalLine(reader, line)) {
+    while (NextPhysicalLine(catalogue, line)) {
         if (IsNumberLine(line)) {
             if (ProgressListOn) AddProgressLine("Remove => " + std::string(line));
             continue;
@@ -87,11 +114,13 @@ std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering
             DrainOnePendingEvent();
             AddProgressLine(std::string(line));
         }
-        if (numbering == Numbering::Renumber && IsBuildingHeader(line))
-            text.append(NumberInParentheses(number++)).append("\r\n");
-        text.append(line).append("\r\n");
+        if (numbering == Numbering::Renumber && IsBuildingHeader(line)) {
+            sink(NumberInParentheses(number++));
+            sink("\r\n");
+        }
+        sink(line);
+        sink("\r\n");
     }
-    return text;
 }
 
 bool IsTextCatalogue(std::string_view bytes) {

@@ -3,6 +3,9 @@
 
 #include "output/command_result.h"
 
+#include "catalogue/catalogue_reader.h"
+
+#include <functional>
 #include <string>
 #include <string_view>
 
@@ -15,10 +18,11 @@ bool IsNumberLine(std::string_view line);
 bool IsTextCatalogue(std::string_view bytes);
 
 enum class Numbering { Renumber, Denumber };
-// The catalogue's new text: number lines left out and, when renumbering, a fresh one counting
-// from 0 above every line that begins with "[bui". Every other line is kept byte for byte, ending
-// in CR LF. Each line left out or kept goes to the progress list while it is on.
-std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering);
+// The catalogue's new text, given to the sink a piece at a time: number lines left out and, when
+// renumbering, a fresh one counting from 0 above every line that begins with "[bui". Every other
+// line is kept byte for byte, ending in CR LF. Each line left out or kept goes to the progress list
+// while it is on.
+void RewriteCatalogue(LineReader& catalogue, Numbering numbering, const std::function<void(std::string_view)>& sink);
 
 // static.ini is replaced in one step by the finished static.ini.tmp, or stays as it was. One run at
 // a time: a second one says so and stops.

@@ -18,7 +18,8 @@ namespace {
 // fopen does neither. It cannot judge a catalogue with a mesh value that the two open differently.
 bool HostOpensOtherwise() {
     std::string catalogue = ReadFile("static.ini");
-    for (const MeshIndexEntry& entry : BuildMeshIndex(catalogue))
+    LineReader lines = LinesOf(catalogue);
+    for (const MeshIndexEntry& entry : BuildMeshIndex(lines))
         for (const std::string* value : {&entry.mesh, &entry.meshLive, &entry.meshDead})
             for (const char* mod : {"Pack\\", "Caps\\", ".\\", "..\\"}) {  // "." and ".." hold a 3do too
                 std::string path = Scratch + "mods\\" + mod + *value;
@@ -28,6 +29,13 @@ bool HostOpensOtherwise() {
                     return true;
             }
     return false;
+}
+
+std::string Rewritten(const std::string& catalogue, Numbering numbering) {
+    std::string text;
+    LineReader lines = LinesOf(catalogue);
+    RewriteCatalogue(lines, numbering, [&text](std::string_view piece) { text.append(piece); });
+    return text;
 }
 
 }  // namespace
@@ -83,8 +91,8 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     RequireBaseline(CheckMeshReferences(Scratch, Scratch + "mods\\", MeshCheck::MissingMeshes),
                     "Missing_3do.txt", "open-per-mesh", "\r\nNot found: ", HostOpensOtherwise);
 
-    std::string renumbered = RewrittenCatalogue(input, Numbering::Renumber);
-    Require(RewrittenCatalogue(renumbered, Numbering::Renumber) == renumbered,
+    std::string renumbered = Rewritten(input, Numbering::Renumber);
+    Require(Rewritten(renumbered, Numbering::Renumber) == renumbered,
             "a second renumbering changes nothing");
     if (judged) RunBaselineOnScratch("two-passes");
     Require(!judged || ReadFile("static.ini") == renumbered, "renumbering as the plain two passes");
@@ -100,5 +108,11 @@ extern "C" int LLVMFuzzerTestOneInput(const std::uint8_t* data, std::size_t size
     WriteFile("static.ini", input);
     Require(ReadWholeFile(Scratch, "static.ini", read) == FileRead::Whole && read == input,
             "the file is read whole");
+    // Read in small blocks, the file gives the lines the bytes give in memory.
+    LineReader inMemory = LinesOf(input), inBlocks = LinesOfFile(OpenForReading(Scratch + "static.ini"), 1 + size % 7);
+    for (bool more = true; more;) {
+        more = NextPhysicalLine(inMemory, raw);
+        Require(NextPhysicalLine(inBlocks, line) == more && (!more || line == raw), "the lines of a file in blocks");
+    }
     return 0;
 }

@@ -1,6 +1,9 @@
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/name_table.h"
 
 #include "test_support.h"
+
+#include <random>
 
 using namespace std::string_literals;
 
@@ -14,6 +17,21 @@ Strings Lines(const std::string& bytes, bool trimmed = false) {
         lines.emplace_back(line);
     return lines;
 }
+
+class FileLinesTest : public ScratchTest {
+protected:
+    // The lines of the bytes written to a file and read blockSize bytes at a time.
+    Strings FileLines(const std::string& bytes, std::size_t blockSize, bool trimmed = false) {
+        Write("lines.txt", bytes);
+        EXPECT_TRUE(MakeFolderCurrent(Folder("")));
+        reader = LinesOfFile(OpenForReading("lines.txt"), blockSize);
+        std::string_view line;
+        Strings lines;
+        while (trimmed ? NextCatalogueLine(reader, line) : NextPhysicalLine(reader, line)) lines.emplace_back(line);
+        return lines;
+    }
+    LineReader reader;
+};
 
 }  // namespace
 
@@ -66,6 +84,47 @@ TEST(CatalogueReader, SectionNamesOfTrimmedBuildingHeadersInFileOrder) {
     const std::string catalogue =
         "// [buildings.House$Comment]\r\n  [buildings.House$B] // moved\n\t[buildings.House$Tab]\r"
         "[Buildings.House$C]\r\n[buildings.Plate$A]\r\n[bui";
+    LineReader lines = LinesOf(catalogue);
+    SectionNames sections;
+    ReadSectionNames(lines, sections);
     std::vector<std::string_view> expected = {"buildings.House$B", "buildings.Plate$A", "bui"};
-    EXPECT_EQ(BuildingSectionNames(catalogue), expected);
+    EXPECT_EQ(sections.names, expected);
+}
+
+// Wherever the blocks cut the bytes (inside a CR LF, a long line, a run of blanks), a file gives the
+// lines the same bytes give in memory.
+TEST_F(FileLinesTest, BlocksCutLinesAnywhere) {
+    std::mt19937 random(5);
+    const char alphabet[] = {'a', 'b', ' ', '\r', '\n', '\0'};
+    for (int round = 0; round < 300; ++round) {
+        std::string bytes(random() % 40, 'a');
+        for (char& c : bytes) c = alphabet[random() % 6];
+        if (round % 10 == 0) bytes.insert(random() % (bytes.size() + 1), std::string(300, 'x') + "\r");
+        std::size_t blockSize = 1 + random() % 7;
+        SCOPED_TRACE(testing::PrintToString(bytes) + " in blocks of " + std::to_string(blockSize));
+        EXPECT_EQ(FileLines(bytes, blockSize), Lines(bytes));
+        EXPECT_EQ(FileLines(bytes, blockSize, true), Lines(bytes, true));
+        EXPECT_FALSE(reader.ReadFailed());
+    }
+}
+
+TEST_F(FileLinesTest, LookingAheadTakesNoLine) {
+    Write("lines.txt", "ab\r\ncd\ref");
+    ASSERT_TRUE(MakeFolderCurrent(Folder("")));
+    reader = LinesOfFile(OpenForReading("lines.txt"), 2);
+    EXPECT_TRUE(reader.Ahead(5).starts_with("ab\r\nc"));
+    EXPECT_EQ(reader.Ahead(100), "ab\r\ncd\ref");
+    std::string_view line;
+    Strings lines;
+    while (NextPhysicalLine(reader, line)) lines.emplace_back(line);
+    EXPECT_EQ(lines, Strings({"ab", "cd", "ef"}));
+}
+
+TEST_F(FileLinesTest, AFailedReadEndsTheLinesAndIsTold) {
+    HeadlessFileFaults faults;
+    faults.failReadName = "lines.txt";
+    faults.failReadAfterBytes = 8;
+    HeadlessSetFileFaults(faults);
+    EXPECT_EQ(FileLines("line 1\nline 2\nline 3\n", 3), Strings({"line 1", "l"}));
+    EXPECT_TRUE(reader.ReadFailed());
 }

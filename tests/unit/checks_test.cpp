@@ -8,6 +8,9 @@
 #include "rewrite/renumbering.h"
 #include "test_support.h"
 
+#include <algorithm>
+#include <random>
+
 namespace {
 
 const std::string Stars14(14, '*'), Stars38(38, '*');
@@ -20,8 +23,13 @@ std::string Joined(std::initializer_list<std::string_view> parts) {
     return text;
 }
 
+std::vector<MeshIndexEntry> IndexOf(const std::string& catalogue) {
+    LineReader lines = LinesOf(catalogue);
+    return BuildMeshIndex(lines);
+}
+
 Strings MeshIndexOf(const std::string& catalogue, bool exclude = false) {
-    std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
+    std::vector<MeshIndexEntry> index = IndexOf(catalogue);
     if (exclude) ExcludeStandardTitles(index);
     Strings described;
     for (const MeshIndexEntry& e : index)
@@ -40,21 +48,83 @@ Strings Emitted(MeshReport report, const std::vector<MeshIndexEntry>& index, Mes
 
 }  // namespace
 
+// The pair lines of a catalogue of these section names, held `window` at a time; every header must
+// reach the sink once, in order.
+Strings DoubledLines(const Strings& names, NameWindow window, int& passes) {
+    std::string catalogue = "[***]\r\n";
+    for (const std::string& name : names) catalogue += "  [" + name + "]\r\nMesh 3do/x.sim\r\n[Bui" + name + "]\n";
+    Strings lines;
+    int expectedIndex = 0;
+    passes = 0;
+    long long headers = PairDoubledNames(
+        [&](LineReader& reader) {
+            ++passes;
+            reader = LinesOf(catalogue);
+            return true;
+        },
+        window,
+        [&](const NamedObject& object) {
+            EXPECT_EQ(object.index, expectedIndex++);
+            EXPECT_EQ(object.name, names[object.index]);
+            if (object.next >= 0) lines.push_back(DoubledObjectLine(object));
+        });
+    EXPECT_EQ(headers, static_cast<long long>(names.size()));
+    return lines;
+}
+
 TEST(Checks, DoubledNamesPairEachOccurrenceWithItsNextRepeat) {
     const struct {
-        std::vector<std::string_view> names;
-        Strings lines;
+        Strings names, lines;
     } cases[] = {
-        {{"A", "B", "A", "C", "B", "A"},
-         {"Double object (0) => (2): A", "Double object (1) => (4): B", "Double object (2) => (5): A"}},
-        {{"x", "y", "Q", "z", "w", "Q", "v", "u", "t", "Q"},
-         {"Double object (2) => (5): Q", "Double object (5) => (9): Q"}},
-        {{"a", "A", "a "}, {}}, {{"", ""}, {"Double object (0) => (1): "}}};
+        {{"buiA", "buiB", "buiA", "buiC", "buiB", "buiA"},
+         {"Double object (0) => (2): buiA", "Double object (1) => (4): buiB", "Double object (2) => (5): buiA"}},
+        {{"buix", "buiy", "buiQ", "buiz", "buiw", "buiQ", "buiv", "buiu", "buit", "buiQ"},
+         {"Double object (2) => (5): buiQ", "Double object (5) => (9): buiQ"}},
+        {{"buia", "buiA", "buia "}, {}}, {{"bui", "bui"}, {"Double object (0) => (1): bui"}}, {{}, {}}};
     for (const auto& c : cases) {
-        Strings lines;
-        for (const DoubledObject& pair : PairDoubledNames(c.names)) lines.push_back(DoubledObjectLine(pair));
-        EXPECT_EQ(lines, c.lines);
+        int passes = 0;
+        EXPECT_EQ(DoubledLines(c.names, NameWindow(), passes), c.lines);
+        EXPECT_EQ(passes, 1) << "a catalogue whose names fit in the window is read once";
     }
+}
+
+// However small the window, the pairs are those of the plain walk over all pairs.
+TEST(Checks, DoubledNamesInSmallWindowsPairAsTheWholeWalkDoes) {
+    std::mt19937 random(11);
+    for (int round = 0; round < 300; ++round) {
+        Strings names(random() % 40);
+        for (std::string& name : names) name = "bui" + std::string(1 + random() % 3, static_cast<char>('a' + random() % 4));
+        Strings expected;
+        for (std::size_t i = 0; i < names.size(); ++i) {
+            auto next = std::find(names.begin() + static_cast<long>(i) + 1, names.end(), names[i]);
+            if (next != names.end())
+                expected.push_back("Double object (" + std::to_string(i) + ") => (" +
+                                   std::to_string(next - names.begin()) + "): " + names[i]);
+        }
+        NameWindow window;
+        window.names = 1 + random() % 6;
+        window.nameBytes = random() % 2 ? 1 + random() % 20 : window.nameBytes;
+        int passes = 0;
+        EXPECT_EQ(DoubledLines(names, window, passes), expected) << "round " << round;
+        if (names.size() > window.names) {
+            EXPECT_GT(passes, 1);
+        }
+    }
+}
+
+TEST(Checks, DoubledNamesFailWhenALaterPassDoesNotOpen) {
+    const std::string catalogue = "[buiA]\n[buiB]\n[buiA]\n";
+    int passes = 0, objects = 0;
+    NameWindow window;
+    window.names = 1;
+    long long headers = PairDoubledNames(
+        [&](LineReader& reader) {
+            reader = LinesOf(catalogue);
+            return ++passes == 1;
+        },
+        window, [&](const NamedObject&) { ++objects; });
+    EXPECT_EQ(headers, -1);
+    EXPECT_EQ(objects, 1);
 }
 
 TEST(Checks, FirstMatchingPrefixAcceptsALine) {
@@ -77,8 +147,10 @@ TEST(Checks, IrregularLinesCountBuilLinesAndSkipEmptyOnes) {
         "[buildings.Tree$B]\r\n\tMesh x\r\n[buiX]\r\nL";
     auto judged = [&](bool keepRegular) {
         Strings lines;
-        for (const JudgedLine& j : JudgeCatalogueLines(catalogue, keepRegular))
+        LineReader reader = LinesOf(catalogue);
+        JudgeCatalogueLines(reader, keepRegular, [&](const JudgedLine& j) {
             lines.push_back(Joined({std::to_string(j.objectNumber), j.prefix, j.line}));
+        });
         return lines;
     };
     const Strings irregular = {"0||Wobble 0", "1||Colour red", "2||[buildings.Tree$B]", "2||\tMesh x",
@@ -95,8 +167,10 @@ TEST(Checks, EmptyReferencesAreKeysAloneOnTheirLine) {
         "Mesh\r\n[buildings.House$A] // moved\r\nMesh   \r\n  MeshLive\r\nMesh\t\r\nMeshDead 3do/a.sim\r\n"
         "mesh\r\nMesh=\r\nMeshLiveX\r\n[buildings.House$B]\nMeshDead\n[Buildings.House$C]\nMesh";
     Strings found;
-    for (const EmptyReference& r : FindEmptyReferenceLines(catalogue))
+    LineReader reader = LinesOf(catalogue);
+    FindEmptyReferenceLines(reader, [&](const EmptyReference& r) {
         found.push_back(Joined({std::to_string(r.objectNumber), r.sectionName, r.key}));
+    });
     EXPECT_EQ(found, Strings({"-1||Mesh", "0|buildings.House$A] // move|Mesh",
                               "0|buildings.House$A] // move|MeshLive", "1|buildings.House$B|MeshDead",
                               "1|buildings.House$B|Mesh"}));
@@ -182,7 +256,7 @@ TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
               "MeshDead 3do\\A\\l.sim", "[bui$Case]", "MeshLive 3do/a.sim", "MeshDead 3DO/a.sim",
               "[bui$Prefix]", "MeshLive ../3do/a.sim", "MeshDead 3do/a.sim", "[bui$NoValue]",
               "MeshLive a.sim", "MeshDead a.sim"});
-    std::vector<MeshIndexEntry> index = BuildMeshIndex(catalogue);
+    std::vector<MeshIndexEntry> index = IndexOf(catalogue);
     ClearAppState();
     ExcludeStandardTitles(index);
     const Strings opening = {" ", Stars38, "Using the same MeshLive/MeshDead", Stars38, " "};
@@ -204,6 +278,13 @@ TEST(Checks, NumberLines) {
     for (const char* line :
          {"", "()", "(a)", "(1", "1)", "(1)x", "x(1)", "\t(1)", "(1) (2)", "(-1)", "( 1)", "((1))"})
         EXPECT_FALSE(IsNumberLine(line)) << line;
+}
+
+std::string RewrittenCatalogue(const std::string& catalogue, Numbering numbering) {
+    std::string text;
+    LineReader reader = LinesOf(catalogue);
+    RewriteCatalogue(reader, numbering, [&text](std::string_view piece) { text.append(piece); });
+    return text;
 }
 
 TEST(Checks, RenumberingRoundTripEndsEveryLineWithCrLf) {

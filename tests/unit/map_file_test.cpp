@@ -44,8 +44,13 @@ TEST(MapFile, SelectionSplitsAtItsFirstStar) {
 }
 
 TEST(MapFile, FirstOrdinalOfEachNameCountsFromZero) {
-    EXPECT_EQ(FirstSectionOrdinals({"A", "B", "a", "A", "C", "", "A "}, {"X", "A", "B", "A", "", " A"}),
+    auto ordinals = [](const Strings& mapNames, const std::string& catalogue) {
+        LineReader lines = LinesOf(catalogue);
+        return FirstSectionOrdinals(mapNames, lines);
+    };
+    EXPECT_EQ(ordinals({"buiA", "buiB", "buia", "buiA", "buiC", "bui", "buiA "},
+                       "[buiX]\r\n[buiA]\r\nMesh x\r\n[buiB]\r\n[Bui]\r\n[buiA]\r\n[bui]\r\n[bui A]\r\n"),
               std::vector<int>({1, 2, NotInCatalogue, 1, NotInCatalogue, 4, NotInCatalogue}));
-    EXPECT_EQ(FirstSectionOrdinals({"X"}, {"X"}), std::vector<int>({0}));
-    EXPECT_EQ(FirstSectionOrdinals({"A"}, {}), std::vector<int>({NotInCatalogue}));
+    EXPECT_EQ(ordinals({"buiX"}, "[buiX]"), std::vector<int>({0}));
+    EXPECT_EQ(ordinals({"buiA"}, ""), std::vector<int>({NotInCatalogue}));
 }

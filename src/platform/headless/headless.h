@@ -100,7 +100,8 @@ void HeadlessSetFileFaults(const HeadlessFileFaults& faults);
 void HeadlessSetMenuBarFails(bool fails);
 void HeadlessSetWindowFails(const std::string& title);  // opening a window of this title fails
 
-// verrant-cli: list lines to standard output, message boxes to standard error as "Title: text".
+// verrant-cli: list lines to standard output (and not kept), message boxes to standard error as
+// "Title: text".
 void HeadlessEcho(bool listLines, bool messages);
 
 // Host path of a program path ("\" turned into the host's separator); no case matching.

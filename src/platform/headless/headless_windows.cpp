@@ -143,11 +143,13 @@ void ClearListControl(Handle list) {
     if (HeadlessControl* found = FindControl(list)) found->lines.clear();
 }
 
+// Echoed lines are not kept as well: a run over millions of lines would hold them all.
 void AppendListLine(Handle list, const std::string& text) {
-    if (HeadlessControl* found = FindControl(list)) found->lines.push_back(text);
     if (EchoListLines) {
         std::fwrite(text.data(), 1, text.size(), stdout);
         std::fputc('\n', stdout);
+    } else if (HeadlessControl* found = FindControl(list)) {
+        found->lines.push_back(text);
     }
 }
 
