@@ -4,7 +4,6 @@
 //   bench-missing-objects FOLDER    builds FOLDER/mods/... and leaves it there for verrant-cli
 #include "map_records.h"
 #include "catalogue/catalogue_reader.h"
-#include "catalogue/name_table.h"
 #include "maps/map_file.h"
 #include "maps/missing_map_objects.h"
 #include "platform/headless/headless.h"
@@ -99,10 +98,10 @@ int main(int argc, char** argv) {
     std::vector<std::string> names = ExtractMapObjectNames(ReadMapFileText(mapFolder, mapName));
     std::string catalogueBytes;
     ReadWholeFile(catalogueFolder, "static.ini", catalogueBytes);
-    SectionNames catalogueNames;
+    std::vector<std::string> sectionNames;
     LineReader catalogueLines = LinesOf(catalogueBytes);
-    ReadSectionNames(catalogueLines, catalogueNames);
-    const std::vector<std::string_view>& sections = catalogueNames.names;
+    ForEachBuildingSectionName(catalogueLines, [&](std::string_view name) { sectionNames.emplace_back(name); });
+    const std::vector<std::string_view> sections(sectionNames.begin(), sectionNames.end());
     // The lookup as the check makes it: the map's names in a table, the catalogue read past them.
     auto lookUp = [&catalogueBytes](const std::vector<std::string>& placed) {
         LineReader lines = LinesOf(catalogueBytes);

@@ -72,7 +72,7 @@ else
 fi
 
 # Further suites print their own closing line; the package suite makes the download zip.
-for suite in tests/e2e/run-e2e.sh tests/package/run-package-test.sh tests/fuzz/run-fuzz.sh; do
+for suite in tests/e2e/run-e2e.sh tests/package/run-package-test.sh tests/fuzz/run-fuzz.sh tests/memory/run-memory-test.sh; do
     [ -f "$suite" ] || continue
     bash "$suite" >"$logs/$(basename "$suite" .sh).log" 2>&1
     add_counts "$logs/$(basename "$suite" .sh).log" "$suite"

@@ -15,17 +15,28 @@ int& NameSlot(NameTable& table, const std::vector<std::string_view>& names, std:
     return table.slots[place];
 }
 
-void ReadSectionNames(LineReader& catalogue, SectionNames& sections) {
-    std::vector<std::size_t> ends;
-    ForEachBuildingSectionName(catalogue, [&](std::string_view name) {
-        sections.bytes.append(name);
-        ends.push_back(sections.bytes.size());
-    });
-    sections.names.clear();
-    sections.names.reserve(ends.size());
-    std::size_t start = 0;
-    for (std::size_t end : ends) {
-        sections.names.push_back(std::string_view(sections.bytes).substr(start, end - start));
-        start = end;
+NameTable FirstPlaces(const std::vector<std::string_view>& names) {
+    NameTable table = NameTableFor(names.size());
+    for (std::size_t i = 0; i < names.size(); ++i) {
+        int& slot = NameSlot(table, names, names[i]);
+        if (slot < 0) slot = static_cast<int>(i);
     }
+    return table;
+}
+
+HeldNames::HeldNames(NameWindow window) : limits(window) { bytes.reserve(limits.nameBytes); }
+
+bool HoldName(HeldNames& held, std::string_view name) {
+    bool full = held.names.size() == held.limits.names || held.bytes.size() + name.size() > held.bytes.capacity();
+    if (full && !held.names.empty()) return false;
+    std::size_t at = held.bytes.size();
+    held.bytes.append(name);
+    held.names.push_back(std::string_view(held.bytes).substr(at));
+    return true;
+}
+
+bool SkipBuildingHeaders(LineReader& catalogue, long long count) {
+    std::string_view line;
+    while (count > 0 && NextCatalogueLine(catalogue, line)) count -= IsBuildingHeader(line);
+    return count == 0;
 }

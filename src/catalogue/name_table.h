@@ -3,6 +3,7 @@
 
 #include "catalogue/catalogue_reader.h"
 
+#include <functional>
 #include <string>
 #include <string_view>
 #include <vector>
@@ -17,11 +18,28 @@ NameTable NameTableFor(std::size_t count);
 // The slot for the name: it holds the index of an equal name among names, or -1 when no such name
 // has been put in yet; the caller puts one in by setting it.
 int& NameSlot(NameTable& table, const std::vector<std::string_view>& names, std::string_view name);
+// A table of the names, each slot holding the first place of its name.
+NameTable FirstPlaces(const std::vector<std::string_view>& names);
 
-// The section names of a catalogue's building headers, in file order, held in one block.
-struct SectionNames {
-    std::string bytes;
-    std::vector<std::string_view> names;  // views into bytes
+// How many names a check holds at once: a catalogue with more is read again for the rest, so that
+// its memory stays within these, however many objects the catalogue has.
+struct NameWindow {
+    std::size_t nameBytes = 8 << 20;
+    std::size_t names = 1 << 19;
 };
-// Reads them by the bracket cut.
-void ReadSectionNames(LineReader& catalogue, SectionNames& sections);
+
+// Opens a fresh pass over the catalogue's lines; false when it does not open.
+using CataloguePass = std::function<bool(LineReader&)>;
+
+// Names held in one block reserved up front, so that the views into it stay valid.
+struct HeldNames {
+    explicit HeldNames(NameWindow window);
+    NameWindow limits;
+    std::string bytes;
+    std::vector<std::string_view> names;
+};
+// Adds the name at the end; false, with nothing added, when it would pass a limit. An empty window
+// takes any name, however long.
+bool HoldName(HeldNames& held, std::string_view name);
+// Reads on over the given number of building headers; false when the catalogue ends first.
+bool SkipBuildingHeaders(LineReader& catalogue, long long count);

@@ -13,8 +13,8 @@ namespace {
 
 // The names of one window of headers, each with its next repetition once known.
 struct Window {
-    std::string bytes;  // reserved once, so the views into it hold
-    std::vector<std::string_view> names;
+    explicit Window(NameWindow limits) : held(limits), latest(NameTableFor(limits.names)) {}
+    HeldNames held;
     std::vector<int> next;
     NameTable latest;         // each name's latest place in the window
     std::size_t waiting = 0;  // names whose latest place has no next yet
@@ -23,7 +23,7 @@ struct Window {
 
 // A header after the window is the next of its name's latest place, when that has none yet.
 void NoteLaterHeader(Window& window, std::string_view name) {
-    int slot = NameSlot(window.latest, window.names, name);
+    int slot = NameSlot(window.latest, window.held.names, name);
     if (slot >= 0 && window.next[slot] < 0) {
         window.next[slot] = static_cast<int>(window.following);
         --window.waiting;
@@ -33,26 +33,20 @@ void NoteLaterHeader(Window& window, std::string_view name) {
 
 // Fills the window from the reader, standing at the window's first header; true when the catalogue
 // ended within it.
-bool FillWindow(LineReader& reader, Window& window, const NameWindow& limits) {
+bool FillWindow(LineReader& reader, Window& window) {
     std::string_view line;
     while (NextCatalogueLine(reader, line)) {
         if (!IsBuildingHeader(line)) continue;
         std::string_view name = SectionNameByBracket(line);
-        bool full = window.names.size() == limits.names ||
-                    window.bytes.size() + name.size() > window.bytes.capacity();
-        // A window always takes its first name, even one larger than the window.
-        if (full && !window.names.empty()) {
+        if (!HoldName(window.held, name)) {
             NoteLaterHeader(window, name);
             return false;
         }
-        std::size_t at = window.bytes.size();
-        window.bytes.append(name);
-        window.names.push_back(std::string_view(window.bytes).substr(at));
         window.next.push_back(-1);
-        int& slot = NameSlot(window.latest, window.names, window.names.back());
+        int& slot = NameSlot(window.latest, window.held.names, window.held.names.back());
         if (slot >= 0) window.next[slot] = static_cast<int>(window.following);
         else ++window.waiting;
-        slot = static_cast<int>(window.names.size()) - 1;
+        slot = static_cast<int>(window.held.names.size()) - 1;
         ++window.following;
     }
     return true;
@@ -73,21 +67,18 @@ long long PairDoubledNames(const CataloguePass& openPass, NameWindow limits,
     for (;;) {
         LineReader reader;
         if (!openPass(reader)) return -1;
-        std::string_view line;
-        for (long long skipped = 0; skipped < first && NextCatalogueLine(reader, line);)
-            skipped += IsBuildingHeader(line);
-        Window window;
+        SkipBuildingHeaders(reader, first);
+        Window window(limits);
         window.following = first;
-        window.bytes.reserve(limits.nameBytes);
-        window.latest = NameTableFor(limits.names);
-        bool ended = FillWindow(reader, window, limits);
+        bool ended = FillWindow(reader, window);
         if (!ended) FindLaterRepetitions(reader, window);
         if (reader.ReadFailed()) return -1;
         // Clicks made while a window was read are dropped, as during every check.
         DrainPendingEvents();
-        for (std::size_t i = 0; i < window.names.size(); ++i)
-            sink({static_cast<int>(first + static_cast<long long>(i)), window.names[i], window.next[i]});
-        first += static_cast<long long>(window.names.size());
+        const std::vector<std::string_view>& names = window.held.names;
+        for (std::size_t i = 0; i < names.size(); ++i)
+            sink({static_cast<int>(first + static_cast<long long>(i)), names[i], window.next[i]});
+        first += static_cast<long long>(names.size());
         if (ended) return first;
     }
 }
@@ -105,17 +96,7 @@ CommandResult FindDoubledObjects(const std::string& catalogueFolder, int& findin
     const std::string ruler(67, '*');
     FindingsWriter writer{{"Doubled_objects.txt", "Doubled objects in your static.ini:", "No doubled objects",
                            "No doubled objects found in your static.ini"}};
-    bool opened = false;
-    // The first pass is the reader opened above; a later one that fails to open is a failed read.
-    CataloguePass openPass = [&](LineReader& reader) {
-        if (!opened) {
-            opened = true;
-            reader = std::move(first);
-            return true;
-        }
-        return OpenLines(catalogueFolder, "static.ini", reader) == FileRead::Whole;
-    };
-    long long objects = PairDoubledNames(openPass, NameWindow(), [&](const NamedObject& object) {
+    long long objects = PairDoubledNames(PassesOver(catalogueFolder, first), NameWindow(), [&](const NamedObject& object) {
         if (ProgressListOn) {
             DrainPendingEvents();
             AddProgressLine("Build (" + std::to_string(object.index) + ") " + std::string(object.name));

@@ -2,6 +2,7 @@
 #pragma once
 
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/name_table.h"
 #include "output/command_result.h"
 
 #include <functional>
@@ -16,14 +17,6 @@ struct NamedObject {
     int next = -1;
 };
 
-// How many names one pass holds at most: a catalogue with more is read once more per window.
-struct NameWindow {
-    std::size_t nameBytes = 16 << 20;
-    std::size_t names = 1 << 20;
-};
-
-// Opens a fresh pass over the catalogue's lines; false when it does not open.
-using CataloguePass = std::function<bool(LineReader&)>;
 // Gives every building header to the sink in file order, paired with its next repetition. The
 // names are held a window at a time: the rest of the catalogue is scanned for the repetitions of a
 // window's last names before the window goes to the sink. Returns the number of headers, or -1 when

@@ -2,6 +2,7 @@
 // picked map is, with one report for all of them.
 #pragma once
 
+#include "catalogue/name_table.h"
 #include "output/command_result.h"
 
 #include <string>
@@ -25,5 +26,6 @@ std::string AllMapsSummary(const AllMapsCount& count);
 // Checks every map file below the maps folder against static.ini in the catalogue folder and writes
 // Missing_objects_all_maps.txt. A maps folder that cannot be listed fails without a word: the
 // caller knows where it looked.
+// The catalogue's names are held a window at a time, the maps read again for every window.
 CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string& mapsFolder,
-                           AllMapsCount& count);
+                           AllMapsCount& count, NameWindow window = NameWindow());

@@ -14,11 +14,7 @@
 std::vector<int> FirstSectionOrdinals(const std::vector<std::string>& mapNames, LineReader& catalogue) {
     std::vector<std::string_view> names(mapNames.begin(), mapNames.end());
     std::vector<int> firstOrdinal(names.size(), NotInCatalogue);
-    NameTable place = NameTableFor(names.size());
-    for (std::size_t i = 0; i < names.size(); ++i) {
-        int& slot = NameSlot(place, names, names[i]);
-        if (slot < 0) slot = static_cast<int>(i);
-    }
+    NameTable place = FirstPlaces(names);
     int ordinal = 0;
     ForEachBuildingSectionName(catalogue, [&](std::string_view name) {
         int slot = NameSlot(place, names, name);

@@ -29,3 +29,12 @@ bool CatalogueReadsWhole(const std::string& folder, const CatalogueOpenFailure& 
     while (NextPhysicalLine(catalogue, line)) {}
     return ReadToTheEnd(catalogue);
 }
+
+CataloguePass PassesOver(const std::string& folder, LineReader& opened) {
+    return [&opened, folder, first = true](LineReader& reader) mutable {
+        if (!first) return OpenLines(folder, "static.ini", reader) == FileRead::Whole;
+        first = false;
+        reader = std::move(opened);
+        return true;
+    };
+}

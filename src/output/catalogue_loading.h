@@ -4,6 +4,7 @@
 #pragma once
 
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/name_table.h"
 
 #include <string>
 
@@ -27,3 +28,6 @@ bool ReadToTheEnd(const LineReader& catalogue);
 // Reads every line of static.ini once, so that a run of several checks knows at its start whether
 // the catalogue reads whole; false, with the user told, when it does not.
 bool CatalogueReadsWhole(const std::string& folder, const CatalogueOpenFailure& notOpened);
+// The passes of a check that reads the catalogue more than once: the first takes the reader opened
+// already; a later one that does not open is a read that failed partway.
+CataloguePass PassesOver(const std::string& folder, LineReader& opened);

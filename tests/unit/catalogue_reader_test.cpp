@@ -1,5 +1,4 @@
 #include "catalogue/catalogue_reader.h"
-#include "catalogue/name_table.h"
 
 #include "test_support.h"
 
@@ -85,10 +84,9 @@ TEST(CatalogueReader, SectionNamesOfTrimmedBuildingHeadersInFileOrder) {
         "// [buildings.House$Comment]\r\n  [buildings.House$B] // moved\n\t[buildings.House$Tab]\r"
         "[Buildings.House$C]\r\n[buildings.Plate$A]\r\n[bui";
     LineReader lines = LinesOf(catalogue);
-    SectionNames sections;
-    ReadSectionNames(lines, sections);
-    std::vector<std::string_view> expected = {"buildings.House$B", "buildings.Plate$A", "bui"};
-    EXPECT_EQ(sections.names, expected);
+    Strings names;
+    ForEachBuildingSectionName(lines, [&names](std::string_view name) { names.emplace_back(name); });
+    EXPECT_EQ(names, Strings({"buildings.House$B", "buildings.Plate$A", "bui"}));
 }
 
 // Wherever the blocks cut the bytes (inside a CR LF, a long line, a run of blanks), a file gives the

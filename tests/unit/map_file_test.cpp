@@ -1,6 +1,10 @@
 #include "maps/map_file.h"
 #include "maps/missing_map_objects.h"
 
+#include "map_records.h"
+#include "maps/all_maps.h"
+#include "output/app_state.h"
+#include "output/progress_list.h"
 #include "test_support.h"
 
 using namespace std::string_literals;
@@ -53,4 +57,29 @@ TEST(MapFile, FirstOrdinalOfEachNameCountsFromZero) {
               std::vector<int>({1, 2, NotInCatalogue, 1, NotInCatalogue, 4, NotInCatalogue}));
     EXPECT_EQ(ordinals({"buiX"}, "[buiX]"), std::vector<int>({0}));
     EXPECT_EQ(ordinals({"buiA"}, ""), std::vector<int>({NotInCatalogue}));
+}
+
+class AllMapsTest : public ScratchTest {};
+
+// However few catalogue names a window holds, every map gets the findings of the whole catalogue.
+TEST_F(AllMapsTest, SmallWindowsFindWhatOneWindowFinds) {
+    UseCatalogue("[***]\r\nTitle A\r\n[buildings.House$A]\r\n[buildings.House$B]\r\n[buildings.House$A]\r\n"
+                 "[buildings.House$C]\r\n[buildings.House$D]\r\n");
+    const std::string maps = "mods/mapmods/maps/";
+    Write(maps + "Coast/actors.static", MapRecordBytes({BuildingClassName("A"), BuildingClassName("X"),
+                                                        BuildingClassName("D"), BuildingClassName("X")}));
+    Write(maps + "Hills/actors.static", MapRecordBytes({BuildingClassName("Y"), BuildingClassName("C")}));
+    Write(maps + "Plain/actors.static", MapRecordBytes({BuildingClassName("B")}));
+    Write(maps + "Junk/actors.static", "no map");
+    ProgressListOn = true;
+    OpenProgressList();
+    auto run = [&](NameWindow window) {
+        AllMapsCount count;
+        EXPECT_EQ(CheckAllMaps(CatalogueFolder, Folder(maps), count, window), CommandResult::Findings);
+        EXPECT_EQ(AllMapsSummary(count), "3 maps checked, 2 with missing objects, 2 names missing, 1 not map files");
+        return Desktop("Missing_objects_all_maps.txt") + "|" + testing::PrintToString(ProgressLines());
+    };
+    const std::string whole = run(NameWindow());
+    EXPECT_NE(whole.find("Map: Coast\\actors.static\r\nbuildings.House$X\r\n\r\nMap: Hills"), std::string::npos);
+    for (std::size_t names : {1, 2, 3}) EXPECT_EQ(run({1 << 20, names}), whole) << names << " names a window";
 }
