@@ -58,7 +58,7 @@ void GenerateTree(const Tree& tree) {
     std::ofstream(stamp) << "";
 }
 
-std::vector<MeshIndexEntry> MakeIndex(const Tree& tree) {
+std::vector<MeshIndexEntry> MakeIndex(const Tree& tree, TextStore& text) {
     std::vector<MeshIndexEntry> index(static_cast<std::size_t>(tree.entries));
     for (int entry = 0; entry < tree.entries; ++entry) {
         MeshIndexEntry& e = index[static_cast<std::size_t>(entry)];
@@ -67,10 +67,10 @@ std::vector<MeshIndexEntry> MakeIndex(const Tree& tree) {
             if (c == '/') c = '\\';
         e.number = entry;
         e.title = entry % 20 == 0 ? "" : "Title Mods";
-        e.sectionName = "buildings.House$Obj" + std::to_string(entry);
-        e.mesh = entry % 8 == 0 ? "3do\\Buildings\\Common\\mono.sim" : object + "\\mono.sim";
-        e.meshLive = object + "\\live.sim";
-        e.meshDead = object + "\\dead.sim";
+        e.sectionName = text.Keep("buildings.House$Obj" + std::to_string(entry));
+        e.mesh = entry % 8 == 0 ? "3do\\Buildings\\Common\\mono.sim" : text.Keep(object + "\\mono.sim");
+        e.meshLive = text.Keep(object + "\\live.sim");
+        e.meshDead = text.Keep(object + "\\dead.sim");
     }
     return index;
 }
@@ -87,7 +87,8 @@ Run Measure(const Tree& tree, void (*search)(std::vector<MeshIndexEntry>&, const
     ProgressListOn = false;
     Handle bar =
         AddProgressBar(OpenTopWindow("Wait", 400, 340, 180, 40, FrameStyle{}), 10, 10, 160, 20, 0, 35);
-    std::vector<MeshIndexEntry> index = MakeIndex(tree);
+    TextStore text;
+    std::vector<MeshIndexEntry> index = MakeIndex(tree, text);
     std::string modsRoot = HeadlessProgramPath(tree.folder + "/mods") + "\\";
     HeadlessFileCounters before = HeadlessCounters();
     auto start = std::chrono::steady_clock::now();

@@ -22,7 +22,7 @@ void SearchModMeshFoldersPlainly(std::vector<MeshIndexEntry>& index, const std::
                 ++visits;
                 for (const MeshSlot& slot : MeshSlots) {
                     if (entry.title.empty() || (entry.*slot.value).empty()) continue;
-                    Handle file = OpenForReading(modsRoot + mod.name + "\\" + entry.*slot.value);
+                    Handle file = OpenForReading((modsRoot + mod.name + "\\").append(entry.*slot.value));
                     if (file == 0) continue;
                     entry.*slot.found = true;
                     CloseFile(file);

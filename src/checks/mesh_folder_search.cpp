@@ -95,11 +95,11 @@ MeshPathPlan PlanMeshPaths(const std::vector<MeshIndexEntry>& index) {
     for (std::size_t entry = 0; entry < index.size(); ++entry) {
         if (index[entry].title.empty()) continue;
         for (const MeshSlot& slot : MeshSlots) {
-            const std::string& value = index[entry].*slot.value;
+            std::string_view value = index[entry].*slot.value;
             // A value ending in "\" names a folder, never a mesh file.
             if (value.empty() || value.back() == '\\' || index[entry].*slot.found) continue;
-            auto [it, added] = fileOfValue.try_emplace(value, static_cast<int>(plan.files.size()));
-            if (added) plan.files.push_back({value, {}, -1, false});
+            auto [it, added] = fileOfValue.try_emplace(std::string(value), static_cast<int>(plan.files.size()));
+            if (added) plan.files.push_back({std::string(value), {}, -1, false});
             plan.files[it->second].refs.push_back({entry, &slot});
         }
     }

@@ -11,6 +11,7 @@
 #include "output/reports.h"
 
 #include <algorithm>
+#include <deque>
 #include <string_view>
 #include <unordered_map>
 
@@ -71,13 +72,13 @@ const std::string StepRuler = "//**************************";
 const std::string EntryRuler(14, '*');
 const std::string SharedRuler(38, '*');
 
-bool IsSet(const std::string& mesh) { return !mesh.empty(); }
-bool IsMissing(const std::string& mesh, bool found) { return IsSet(mesh) && !found; }
+bool IsSet(std::string_view mesh) { return !mesh.empty(); }
+bool IsMissing(std::string_view mesh, bool found) { return IsSet(mesh) && !found; }
 
 std::string ObjectLine(const MeshIndexEntry& entry) { return "Object (" + std::to_string(entry.number) + ")"; }
 
-std::string FoundLine(const std::string& key, const std::string& mesh, bool found) {
-    return (found ? "Found: " : "Not found: ") + key + " " + mesh;
+std::string FoundLine(const std::string& key, std::string_view mesh, bool found) {
+    return ((found ? "Found: " : "Not found: ") + key + " ").append(mesh);
 }
 
 bool SharesLiveDeadMesh(const MeshIndexEntry& entry) {
@@ -114,7 +115,7 @@ bool ListMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink&
         }
         if (IsSet(entry.meshDead)) {
             // The list has always written this one with a capital F.
-            add((entry.meshDeadFound ? "Found: MeshDead " : "Not Found: MeshDead ") + entry.meshDead);
+            add(std::string(entry.meshDeadFound ? "Found: MeshDead " : "Not Found: MeshDead ").append(entry.meshDead));
             reported = reported || !entry.meshDeadFound;
         }
     }
@@ -154,35 +155,43 @@ bool CutMeshValue(std::string_view line, std::string& value) {
     return true;
 }
 
-std::vector<MeshIndexEntry> BuildMeshIndex(LineReader& reader) {
-    std::vector<MeshIndexEntry> index;
-    std::string_view line;
-    std::string title;
+// The entries are gathered where growing moves none of them, then moved once into an index of
+// their own size: a vector grown by doubling would hold up to three times the entries at once.
+MeshIndex BuildMeshIndex(LineReader& reader) {
+    MeshIndex index;
+    std::deque<MeshIndexEntry> entries;
+    std::string_view line, title;
+    std::string value;
     bool grouped = false;
     while (!grouped && NextCatalogueLine(reader, line)) grouped = line == GroupMarker;
     // Only the first group's title line keeps its blanks; every later one is trimmed.
-    if (grouped && NextPhysicalLine(reader, line)) title = line;
+    if (grouped && NextPhysicalLine(reader, line)) title = index.text.Keep(line);
     while (grouped && NextCatalogueLine(reader, line)) {
         // Markers and headers begin with "[", mesh keys with "M": most lines of a big catalogue
         // are passed over at their first byte.
         if (line.empty() || (line[0] != '[' && line[0] != 'M')) continue;
         if (line == GroupMarker) {
-            title = NextCatalogueLine(reader, line) ? line : std::string_view();
+            title = NextCatalogueLine(reader, line) ? index.text.Keep(line) : std::string_view();
         } else if (IsBuildingHeader(line)) {
             MeshIndexEntry entry;
             entry.title = title;
-            entry.sectionName = std::string(SectionNameByEnds(line));
-            entry.number = static_cast<int>(index.size());
-            index.push_back(std::move(entry));
-        } else if (index.empty()) {
+            entry.sectionName = index.text.Keep(SectionNameByEnds(line));
+            entry.number = static_cast<int>(entries.size());
+            entries.push_back(entry);
+        } else if (entries.empty()) {
             continue;  // keys before the first header belong to no entry
-        } else if (StartsWith(line, "Mesh ")) {
-            CutMeshValue(line, index.back().mesh);
-        } else if (StartsWith(line, "MeshLive")) {
-            CutMeshValue(line, index.back().meshLive);
-        } else if (StartsWith(line, "MeshDead")) {
-            CutMeshValue(line, index.back().meshDead);
+        } else {
+            const MeshSlot* slot = StartsWith(line, "Mesh ")      ? &MeshSlots[0]
+                                   : StartsWith(line, "MeshLive") ? &MeshSlots[1]
+                                   : StartsWith(line, "MeshDead") ? &MeshSlots[2]
+                                                                  : nullptr;
+            if (slot && CutMeshValue(line, value)) entries.back().*slot->value = index.text.Keep(value);
         }
+    }
+    index.entries.reserve(entries.size());
+    while (!entries.empty()) {
+        index.entries.push_back(entries.front());
+        entries.pop_front();
     }
     return index;
 }
@@ -227,8 +236,8 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
             add(ObjectLine(entry));
             add(std::string(entry.sectionName));
         }
-        add("MeshLive: " + entry.meshLive);
-        add("MeshDead: " + entry.meshDead);
+        add(std::string("MeshLive: ").append(entry.meshLive));
+        add(std::string("MeshDead: ").append(entry.meshDead));
     }
     if (!reported) add("No doubled used Meshs found");
     return reported;
@@ -274,14 +283,14 @@ bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, Share
     }
     LineReader catalogue;
     FileRead read = OpenLines(catalogueFolder, "static.ini", catalogue);
-    if (read == FileRead::Whole) shared.entries = BuildMeshIndex(catalogue);
+    if (read == FileRead::Whole) shared.index = BuildMeshIndex(catalogue);
     if (read == FileRead::Whole && catalogue.ReadFailed()) read = FileRead::FailedPartway;
     if (read != FileRead::Whole) {
         CloseTopWindow(run.waitWindow);
         TellCatalogueFailure(read, CantOpenCatalogue);
         return false;
     }
-    ExcludeStandardTitles(shared.entries, [&shared](const std::string& line) {
+    ExcludeStandardTitles(shared.index.entries, [&shared](const std::string& line) {
         AddProgressLine(line);
         shared.progressLines.push_back(line);
     });
@@ -292,7 +301,7 @@ bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, Share
 CommandResult FinishMeshRun(const MeshRun& run, const std::string& modsRoot, MeshCheck check,
                             SharedMeshIndex& shared, int& findings) {
     const bool missingMode = check == MeshCheck::MissingMeshes;
-    std::vector<MeshIndexEntry>& index = shared.entries;
+    std::vector<MeshIndexEntry>& index = shared.index.entries;
     if (ProgressListOn) {
         DrainPendingEvents();
         AddLines({" ", StepRuler, "Searching folders & files", " "});

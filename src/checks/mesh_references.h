@@ -4,6 +4,7 @@
 #pragma once
 
 #include "catalogue/catalogue_reader.h"
+#include "catalogue/text_store.h"
 #include "output/command_result.h"
 #include "output/progress_list.h"
 
@@ -12,13 +13,14 @@
 #include <string_view>
 #include <vector>
 
+// Its text is kept by the index it belongs to.
 struct MeshIndexEntry {
-    std::string title;        // the title line of the entry's group; "" once excluded
-    std::string sectionName;  // end cut of the building header
-    int number = 0;           // ordinal among the headers after the first group marker
-    std::string mesh;         // "Mesh " value from its first "3do", "/" turned into "\"; "" when unset
-    std::string meshLive;
-    std::string meshDead;
+    std::string_view title;        // the title line of the entry's group; "" once excluded
+    std::string_view sectionName;  // end cut of the building header
+    int number = 0;                // ordinal among the headers after the first group marker
+    std::string_view mesh;         // "Mesh " value from its first "3do", "/" turned into "\"; "" when unset
+    std::string_view meshLive;
+    std::string_view meshDead;
     bool meshFound = false;
     bool meshLiveFound = false;
     bool meshDeadFound = false;
@@ -26,7 +28,7 @@ struct MeshIndexEntry {
 
 // A mesh field of an entry with its found flag, so the three can be walked in their order.
 struct MeshSlot {
-    std::string MeshIndexEntry::*value;
+    std::string_view MeshIndexEntry::*value;
     bool MeshIndexEntry::*found;
 };
 extern const MeshSlot MeshSlots[3];  // mesh, meshLive, meshDead
@@ -40,8 +42,12 @@ bool CutMeshValue(std::string_view line, std::string& value);
 
 using LineSink = std::function<void(const std::string&)>;
 
-// One entry per building header after the first group marker.
-std::vector<MeshIndexEntry> BuildMeshIndex(LineReader& catalogue);
+// One entry per building header after the first group marker, with the text its entries view.
+struct MeshIndex {
+    std::vector<MeshIndexEntry> entries;
+    TextStore text;
+};
+MeshIndex BuildMeshIndex(LineReader& catalogue);
 // Empties the title of every entry in a standard title group; later steps pass over such entries.
 // While the progress list is on, the steps go to the sink.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add = AddProgressLine);
@@ -60,7 +66,7 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
 // check reads what the other changes (the missing check sets found flags only).
 struct SharedMeshIndex {
     bool made = false;
-    std::vector<MeshIndexEntry> entries;
+    MeshIndex index;
     std::vector<std::string> progressLines;  // making it gave these; the second check shows them again
 };
 // The same with the index of an earlier check of the run; findings is the number of missing meshes,

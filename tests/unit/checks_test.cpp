@@ -23,13 +23,14 @@ std::string Joined(std::initializer_list<std::string_view> parts) {
     return text;
 }
 
-std::vector<MeshIndexEntry> IndexOf(const std::string& catalogue) {
+MeshIndex IndexOf(const std::string& catalogue) {
     LineReader lines = LinesOf(catalogue);
     return BuildMeshIndex(lines);
 }
 
 Strings MeshIndexOf(const std::string& catalogue, bool exclude = false) {
-    std::vector<MeshIndexEntry> index = IndexOf(catalogue);
+    MeshIndex made = IndexOf(catalogue);
+    std::vector<MeshIndexEntry>& index = made.entries;
     if (exclude) ExcludeStandardTitles(index);
     Strings described;
     for (const MeshIndexEntry& e : index)
@@ -256,7 +257,8 @@ TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
               "MeshDead 3do\\A\\l.sim", "[bui$Case]", "MeshLive 3do/a.sim", "MeshDead 3DO/a.sim",
               "[bui$Prefix]", "MeshLive ../3do/a.sim", "MeshDead 3do/a.sim", "[bui$NoValue]",
               "MeshLive a.sim", "MeshDead a.sim"});
-    std::vector<MeshIndexEntry> index = IndexOf(catalogue);
+    MeshIndex made = IndexOf(catalogue);
+    std::vector<MeshIndexEntry>& index = made.entries;
     ClearAppState();
     ExcludeStandardTitles(index);
     const Strings opening = {" ", Stars38, "Using the same MeshLive/MeshDead", Stars38, " "};

@@ -12,13 +12,15 @@
 
 namespace {
 
-MeshIndexEntry Entry(const std::string& title, const std::string& mesh, const std::string& live = "",
-                     const std::string& dead = "") {
+TextStore EntryText;  // what the entries of every test view
+
+MeshIndexEntry Entry(std::string_view title, std::string_view mesh, std::string_view live = "",
+                     std::string_view dead = "") {
     MeshIndexEntry entry;
-    entry.title = title;
-    entry.mesh = mesh;
-    entry.meshLive = live;
-    entry.meshDead = dead;
+    entry.title = EntryText.Keep(title);
+    entry.mesh = EntryText.Keep(mesh);
+    entry.meshLive = EntryText.Keep(live);
+    entry.meshDead = EntryText.Keep(dead);
     return entry;
 }
 
