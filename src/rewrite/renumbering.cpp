@@ -73,8 +73,10 @@ std::string RewriteClaimedCatalogue(const std::string& catalogueFolder, Numberin
     if (writer.file == 0) return CantWriteTemporary;
     RewriteCatalogue(catalogue, numbering, [&writer](std::string_view text) { writer.Write(text); });
     writer.Flush();
+    bool readWhole = !catalogue.ReadFailed();
+    catalogue = LineReader();  // closed now: Windows replaces no file that is open
     std::string failure;
-    if (catalogue.ReadFailed())
+    if (!readWhole)
         failure = CantReadCatalogue.text;
     else if (writer.failed || !FlushToDisk(writer.file))
         failure = CantWriteTemporary;

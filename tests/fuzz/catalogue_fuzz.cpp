@@ -19,10 +19,11 @@ namespace {
 bool HostOpensOtherwise() {
     std::string catalogue = ReadFile("static.ini");
     LineReader lines = LinesOf(catalogue);
-    for (const MeshIndexEntry& entry : BuildMeshIndex(lines))
-        for (const std::string* value : {&entry.mesh, &entry.meshLive, &entry.meshDead})
+    MeshIndex index = BuildMeshIndex(lines);
+    for (const MeshIndexEntry& entry : index.entries)
+        for (const std::string_view* value : {&entry.mesh, &entry.meshLive, &entry.meshDead})
             for (const char* mod : {"Pack\\", "Caps\\", ".\\", "..\\"}) {  // "." and ".." hold a 3do too
-                std::string path = Scratch + "mods\\" + mod + *value;
+                std::string path = (Scratch + "mods\\" + mod).append(*value);
                 Handle opened = OpenForReading(path);
                 if (opened) CloseFile(opened);
                 if (!value->empty() && (opened != 0) != std::filesystem::exists(HeadlessHostPath(path)))

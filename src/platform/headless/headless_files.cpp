@@ -632,6 +632,13 @@ bool ReplaceClaimedFile(Handle claim, Handle replacement) {
     bool written = FlushDescriptor(file->descriptor) == 0 || Failed(source, SystemReason());
     if (!CloseFile(replacement) || !written) return false;
     if (Faults.failReplace) return Failed(claimed->target, InjectedFault);
+    // As on Windows, where a file still open for reading is not replaced.
+    for (const auto& [handle, open] : Files) {
+        struct stat status {};
+        if (fstat(open.descriptor, &status) == 0 && status.st_dev == claimed->status.st_dev &&
+            status.st_ino == claimed->status.st_ino)
+            return Failed(claimed->target, "still open for reading");
+    }
     ForgetListings();
     return MoveIntoPlace(source, *claimed) && Succeeded();
 }
