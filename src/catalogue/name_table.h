@@ -24,8 +24,8 @@ NameTable FirstPlaces(const std::vector<std::string_view>& names);
 // How many names a check holds at once: a catalogue with more is read again for the rest, so that
 // its memory stays within these, however many objects the catalogue has.
 struct NameWindow {
-    std::size_t nameBytes = 8 << 20;
-    std::size_t names = 1 << 19;
+    std::size_t nameBytes = 16 << 20;
+    std::size_t names = 1 << 20;
 };
 
 // Opens a fresh pass over the catalogue's lines; false when it does not open.
