@@ -152,7 +152,14 @@ std::size_t RootLength(const std::string& host) {
 // The host path of a program path with "." and ".." taken by their text, as Windows takes them, so
 // that no part of it needs the disk; linear in its parts.
 std::string TextualHostPath(const std::string& programPath) {
-    std::string host = HeadlessHostPath(FullProgramPath(programPath));
+    // One copy of the path, as every open and listing comes through here.
+    std::string host;
+    if (!IsAbsoluteProgramPath(programPath)) {
+        host.reserve(Current.size() + 1 + programPath.size());
+        host.append(Current).append(1, '\\');
+    }
+    host += programPath;
+    std::replace(host.begin(), host.end(), '\\', '/');
     const std::size_t rootLength = RootLength(host);
     // Most paths have no part to take out: they are their own textual path.
     std::string_view rest = std::string_view(host).substr(rootLength);
@@ -260,6 +267,19 @@ int OpenHost(const std::string& programPath, int flags, std::string& host) {
     host = TextualHostPath(programPath);
     int descriptor = open(host.c_str(), flags, 0666);
     if (descriptor >= 0 || errno != ENOENT) return descriptor;
+    // In a folder matched before, the name as written is what a match finds whenever it opens; only
+    // when it does not are the folder and the name checked the long way.
+    const std::size_t slash = host.rfind('/');
+    auto known = slash == std::string::npos ? MatchedFolders.end() : MatchedFolders.find(host.substr(0, slash));
+    if (known != MatchedFolders.end()) {
+        std::string inKnown = known->second;
+        inKnown.append(host, slash);
+        descriptor = open(inKnown.c_str(), flags, 0666);
+        if (descriptor >= 0) {
+            host = std::move(inKnown);
+            return descriptor;
+        }
+    }
     std::string matched = MatchLetterCase(host);
     if (matched == host) return descriptor;
     host = matched;
@@ -341,7 +361,7 @@ bool ReadFolder(const std::string& host, std::vector<FolderEntry>& found) {
         if (name == "." || name == "..") continue;
         bool isFolder = entry->d_type == DT_DIR;
         if (entry->d_type == DT_LNK || entry->d_type == DT_UNKNOWN) isFolder = IsFolder(host + "/" + name);
-        found.push_back({name, isFolder});
+        found.push_back({std::move(name), isFolder});
         errno = 0;
     }
     int error = errno;
@@ -403,7 +423,7 @@ bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
 #endif
 
 // Holds a descriptor that must be a plain file, which a report created anew is emptied to.
-Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
+Handle Remember(int descriptor, const std::string& name, std::string host, bool emptied) {
     struct stat status {};
     if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) ||
         (emptied && EmptyDescriptor(descriptor) != 0)) {
@@ -414,8 +434,8 @@ Handle Remember(int descriptor, const std::string& name, const std::string& host
     OpenFile file;
     file.descriptor = descriptor;
     file.bareName = BareName(name);
-    file.hostPath = host;
-    Files[++LastFileHandle] = file;
+    file.hostPath = std::move(host);
+    Files.emplace_hint(Files.end(), ++LastFileHandle, std::move(file));
     Succeeded();
     return LastFileHandle;
 }
@@ -498,7 +518,7 @@ Handle OpenForReading(const std::string& name) {
     if (IsInjected(Faults.failOpen, name)) return Failed(ResolveHost(name), InjectedFault);
     int descriptor = OpenHost(name, ReadFlags, host);
     if (descriptor < 0) return Failed(host, SystemReason());
-    return Remember(descriptor, name, host, false);
+    return Remember(descriptor, name, std::move(host), false);
 }
 
 Handle CreateForWriting(const std::string& name) {
@@ -654,15 +674,20 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
                                                      : pattern.substr(0, slash);
     std::string filter = slash == std::string::npos ? pattern : pattern.substr(slash + 1);
     std::string host = TextualHostPath(folder);
-    std::vector<FolderEntry> found;
-    bool listed = ReadFolder(host, found);
-    if (!listed && errno == ENOENT) listed = ReadFolder(host = MatchLetterCase(host), found);
-    if (!listed) return Failed(host, IsFolder(host) ? SystemReason() : NoFolderReason(host));
-    std::erase_if(found, [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); });
-    std::sort(found.begin(), found.end(),
-              [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     if (MatchesPattern(".", filter)) entries.push_back({".", true});
     if (MatchesPattern("..", filter)) entries.push_back({"..", true});
-    entries.insert(entries.end(), found.begin(), found.end());
+    const auto dots = static_cast<std::ptrdiff_t>(entries.size());
+    bool listed = ReadFolder(host, entries);
+    if (!listed && errno == ENOENT) listed = ReadFolder(host = MatchLetterCase(host), entries);
+    if (!listed) {
+        const std::string reason = IsFolder(host) ? SystemReason() : NoFolderReason(host);
+        entries.clear();
+        return Failed(host, reason);
+    }
+    entries.erase(std::remove_if(entries.begin() + dots, entries.end(),
+                                 [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); }),
+                  entries.end());
+    std::sort(entries.begin() + dots, entries.end(),
+              [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     return Succeeded();
 }
