@@ -61,7 +61,11 @@ public:
     // The value under the key, set to value first when the key is new.
     int& FindOrAdd(int owner, std::string_view name, int value) {
         if ((used_ + 1) * 2 > slots_.size()) Grow();
-        const std::uint32_t hash = Hash(owner, name);
+        return FindOrAdd(owner, name, value, Hash(owner, name));
+    }
+
+private:
+    int& FindOrAdd(int owner, std::string_view name, int value, std::uint32_t hash) {
         for (std::size_t i = hash & Mask();; i = (i + 1) & Mask()) {
             Slot& slot = slots_[i];
             if (slot.value < 0) {
@@ -73,7 +77,6 @@ public:
         }
     }
 
-private:
     struct Slot {
         const char* name = nullptr;
         std::uint32_t size = 0;
@@ -107,7 +110,7 @@ private:
         old.swap(slots_);
         Reserve(std::max<std::size_t>(old.size(), 16));
         for (const Slot& slot : old)
-            if (slot.value >= 0) FindOrAdd(slot.owner, std::string_view(slot.name, slot.size), slot.value);
+            if (slot.value >= 0) FindOrAdd(slot.owner, std::string_view(slot.name, slot.size), slot.value, slot.hash);
     }
 
     std::vector<Slot> slots_ = std::vector<Slot>(16);
@@ -217,7 +220,7 @@ int FileOf(MeshPathPlan& plan, std::string_view value, std::unordered_map<std::s
 // The set meshes not yet found of the entries that have a title.
 void PlanMeshPaths(const std::vector<MeshIndexEntry>& index, MeshPathPlan& plan) {
     plan.nodes.push_back({});
-    plan.names.Reserve(index.size() * 2);
+    plan.names.Reserve(index.size() / 2);
     std::unordered_map<std::string_view, int> unjudgedFiles;
     for (std::size_t entry = 0; entry < index.size(); ++entry) {
         if (index[entry].title.empty()) continue;

@@ -227,7 +227,7 @@ std::string NameInFolder(const std::string& folder, std::string_view part) {
 
 // A textual host path with each missing part replaced by the entry that matches it in another letter
 // case. Part by part up to the first part that nothing matches, as nothing is below a missing folder;
-// a folder matched once is taken again while it is there.
+// a folder matched once is taken again while it is there, and the walk starts below the nearest one.
 std::string MatchLetterCase(const std::string& path) {
     const std::size_t rootLength = RootLength(path);
     const std::size_t slash = path.rfind('/');
@@ -236,7 +236,19 @@ std::string MatchLetterCase(const std::string& path) {
     if (known != MatchedFolders.end() && IsFolder(known->second))
         return NameInFolder(known->second, std::string_view(path).substr(slash + 1));
     std::string matched = path.substr(0, rootLength);
-    for (std::size_t start = rootLength; start < path.size();) {
+    std::size_t start = rootLength;
+    for (std::size_t end = parent.empty() ? 0 : parent.rfind('/'); end != std::string::npos && end > rootLength;
+         end = path.rfind('/', end - 1)) {
+        auto above = MatchedFolders.find(path.substr(0, end));
+        if (above == MatchedFolders.end()) continue;
+        if (IsFolder(above->second)) {
+            matched = above->second;
+            start = end + 1;
+        }
+        break;
+    }
+    std::vector<std::pair<std::size_t, std::size_t>> folders;  // where a folder part ends, in path and in matched
+    while (start < path.size()) {
         std::size_t end = std::min(path.find('/', start), path.size());
         std::string_view part(path.data() + start, end - start);
         start = end + 1;
@@ -244,14 +256,18 @@ std::string MatchLetterCase(const std::string& path) {
         std::size_t folderEnd = matched.size();
         if (!matched.empty() && matched.back() != '/') matched += '/';
         matched += part;
-        if (Exists(matched)) continue;
-        std::string match = CaseMatch(folder, part);
-        if (match.empty()) return matched + path.substr(std::min(end, path.size()));
-        matched.resize(folderEnd);
-        if (!matched.empty() && matched.back() != '/') matched += '/';
-        matched += match;
+        if (!Exists(matched)) {
+            std::string match = CaseMatch(folder, part);
+            if (match.empty()) return matched + path.substr(std::min(end, path.size()));
+            matched.resize(folderEnd);
+            if (!matched.empty() && matched.back() != '/') matched += '/';
+            matched += match;
+        }
+        if (end < path.size()) folders.emplace_back(end, matched.size());
     }
-    if (!parent.empty()) MatchedFolders[parent] = matched.substr(0, matched.rfind('/'));
+    for (auto [pathEnd, matchedEnd] : folders)
+        if (pathEnd == parent.size() || path.compare(0, pathEnd, matched, 0, matchedEnd) != 0)
+            MatchedFolders[path.substr(0, pathEnd)] = matched.substr(0, matchedEnd);
     return matched;
 }
 
