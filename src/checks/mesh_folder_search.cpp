@@ -150,6 +150,8 @@ struct MeshPathPlan {
     NameTable names;
     std::vector<int> unjudged;  // opened in every searched folder until found
     std::string path;           // the path opened last, kept for its capacity
+    std::string_view lastFolder;  // the folder of the value placed last and its node: an entry's
+    int lastFolderNode = 0;       // meshes mostly share one
 };
 
 // Whether a listing can show that the name is absent. Windows opens other spellings of these: the
@@ -206,7 +208,12 @@ int FileOf(MeshPathPlan& plan, std::string_view value, std::unordered_map<std::s
         return added;
     }
     const std::size_t slash = value.rfind('\\');
-    const int node = FolderNode(plan, value.substr(0, slash == std::string_view::npos ? 0 : slash));
+    const std::string_view folder = value.substr(0, slash == std::string_view::npos ? 0 : slash);
+    if (folder != plan.lastFolder) {
+        plan.lastFolder = folder;
+        plan.lastFolderNode = FolderNode(plan, folder);
+    }
+    const int node = plan.lastFolderNode;
     const std::string_view name = value.substr(slash == std::string_view::npos ? 0 : slash + 1);
     int& first = plan.names.FindOrAdd(FilesOf(node), name, -1);
     for (int file = first; file >= 0; file = plan.files[file].sameName)
