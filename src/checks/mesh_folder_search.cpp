@@ -48,9 +48,21 @@ public:
         used_ = 0;
     }
 
-    // The value under the key, or -1.
-    int Find(int owner, std::string_view name) const {
-        const std::uint32_t hash = Hash(owner, name);
+    static std::uint32_t Hash(int owner, std::string_view name) {
+        std::uint64_t hash = (static_cast<std::uint64_t>(static_cast<std::uint32_t>(owner)) << 32) ^ name.size();
+        for (std::size_t at = 0; at < name.size(); at += 8) {
+            hash = (hash << 5 | hash >> 59) ^ LowerWord(Word(name.data() + at, name.size() - at));
+            hash *= 0x9E3779B97F4A7C15ull;
+        }
+        hash *= 0x9E3779B97F4A7C15ull;
+        return static_cast<std::uint32_t>(hash >> 32);
+    }
+
+    // Starts fetching the slot a lookup of the hash begins at.
+    void Prefetch(std::uint32_t hash) const { __builtin_prefetch(&slots_[hash & Mask()]); }
+
+    // The value under the key of the hash, or -1.
+    int Find(int owner, std::string_view name, std::uint32_t hash) const {
         for (std::size_t i = hash & Mask();; i = (i + 1) & Mask()) {
             const Slot& slot = slots_[i];
             if (slot.value < 0) return -1;
@@ -86,16 +98,6 @@ private:
     };
 
     std::size_t Mask() const { return slots_.size() - 1; }
-
-    static std::uint32_t Hash(int owner, std::string_view name) {
-        std::uint64_t hash = (static_cast<std::uint64_t>(static_cast<std::uint32_t>(owner)) << 32) ^ name.size();
-        for (std::size_t at = 0; at < name.size(); at += 8) {
-            hash = (hash << 5 | hash >> 59) ^ LowerWord(Word(name.data() + at, name.size() - at));
-            hash *= 0x9E3779B97F4A7C15ull;
-        }
-        hash *= 0x9E3779B97F4A7C15ull;
-        return static_cast<std::uint32_t>(hash >> 32);
-    }
 
     static bool Same(const Slot& slot, int owner, std::string_view name) {
         if (slot.owner != owner || slot.size != name.size()) return false;
@@ -260,14 +262,22 @@ void TryFile(MeshPathPlan& plan, int fileIndex, const std::string& modFolder) {
 // folder ends in "\" and is listed in entries; it stands for the node.
 void WalkFolder(MeshPathPlan& plan, int node, std::string& folder, const std::vector<FolderEntry>& entries,
                 const std::string& modFolder) {
-    for (const FolderEntry& entry : entries) {
+    // The table slots of all the names are fetched together before the first is looked at.
+    std::vector<std::uint32_t> hashes(entries.size());
+    for (std::size_t i = 0; i < entries.size(); ++i) {
+        hashes[i] = NameTable::Hash(entries[i].isFolder ? node : FilesOf(node), entries[i].name);
+        plan.names.Prefetch(hashes[i]);
+    }
+    for (std::size_t i = 0; i < entries.size(); ++i) {
+        const FolderEntry& entry = entries[i];
         if (plan.nodes[node].pending == 0) return;
         if (!entry.isFolder) {
-            for (int file = plan.names.Find(FilesOf(node), entry.name); file >= 0; file = plan.files[file].sameName)
+            for (int file = plan.names.Find(FilesOf(node), entry.name, hashes[i]); file >= 0;
+                 file = plan.files[file].sameName)
                 TryFile(plan, file, modFolder);
             continue;
         }
-        int child = plan.names.Find(node, entry.name);
+        int child = plan.names.Find(node, entry.name, hashes[i]);
         if (child < 0 || plan.nodes[child].pending == 0) continue;
         const std::size_t length = folder.size();
         folder.append(entry.name).append("\\*.*");
