@@ -13,6 +13,7 @@
 #include <algorithm>
 #include <cstdint>
 #include <cstring>
+#include <iterator>
 #include <string_view>
 #include <unordered_map>
 
@@ -230,6 +231,9 @@ int FileOf(MeshPathPlan& plan, std::string_view value, std::unordered_map<std::s
 void PlanMeshPaths(const std::vector<MeshIndexEntry>& index, MeshPathPlan& plan) {
     plan.nodes.push_back({});
     plan.names.Reserve(index.size() / 2);
+    // Room for every field at once: only the pages written are ever touched, and nothing is moved.
+    plan.refs.reserve(index.size() * std::size(MeshSlots));
+    plan.files.reserve(index.size() * std::size(MeshSlots));
     std::unordered_map<std::string_view, int> unjudgedFiles;
     for (std::size_t entry = 0; entry < index.size(); ++entry) {
         if (index[entry].title.empty()) continue;
