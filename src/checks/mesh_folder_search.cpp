@@ -41,7 +41,7 @@ std::uint64_t LowerWord(std::uint64_t word) {
 // lowered copies, so a listed name is looked up as the system gives it. The names point into the
 // index, which outlives the search; nothing is ever removed.
 class NameTable {
-public:
+   public:
     void Reserve(std::size_t count) {
         std::size_t size = 16;
         while (size < count * 2) size *= 2;
@@ -50,7 +50,8 @@ public:
     }
 
     static std::uint32_t Hash(int owner, std::string_view name) {
-        std::uint64_t hash = (static_cast<std::uint64_t>(static_cast<std::uint32_t>(owner)) << 32) ^ name.size();
+        std::uint64_t hash =
+            (static_cast<std::uint64_t>(static_cast<std::uint32_t>(owner)) << 32) ^ name.size();
         for (std::size_t at = 0; at < name.size(); at += 8) {
             hash = (hash << 5 | hash >> 59) ^ LowerWord(Word(name.data() + at, name.size() - at));
             hash *= 0x9E3779B97F4A7C15ull;
@@ -77,7 +78,7 @@ public:
         return FindOrAdd(owner, name, value, Hash(owner, name));
     }
 
-private:
+   private:
     int& FindOrAdd(int owner, std::string_view name, int value, std::uint32_t hash) {
         for (std::size_t i = hash & Mask();; i = (i + 1) & Mask()) {
             Slot& slot = slots_[i];
@@ -103,7 +104,8 @@ private:
     static bool Same(const Slot& slot, int owner, std::string_view name) {
         if (slot.owner != owner || slot.size != name.size()) return false;
         for (std::size_t at = 0; at < name.size(); at += 8)
-            if (LowerWord(Word(slot.name + at, name.size() - at)) != LowerWord(Word(name.data() + at, name.size() - at)))
+            if (LowerWord(Word(slot.name + at, name.size() - at)) !=
+                LowerWord(Word(name.data() + at, name.size() - at)))
                 return false;
         return true;
     }
@@ -113,7 +115,8 @@ private:
         old.swap(slots_);
         Reserve(std::max<std::size_t>(old.size(), 16));
         for (const Slot& slot : old)
-            if (slot.value >= 0) FindOrAdd(slot.owner, std::string_view(slot.name, slot.size), slot.value, slot.hash);
+            if (slot.value >= 0)
+                FindOrAdd(slot.owner, std::string_view(slot.name, slot.size), slot.value, slot.hash);
     }
 
     std::vector<Slot> slots_ = std::vector<Slot>(16);
@@ -151,8 +154,8 @@ struct MeshPathPlan {
     std::vector<MeshFile> files;
     std::vector<MeshRef> refs;
     NameTable names;
-    std::vector<int> unjudged;  // opened in every searched folder until found
-    std::string path;           // the path opened last, kept for its capacity
+    std::vector<int> unjudged;    // opened in every searched folder until found
+    std::string path;             // the path opened last, kept for its capacity
     std::string_view lastFolder;  // the folder of the value placed last and its node: an entry's
     int lastFolderNode = 0;       // meshes mostly share one
 };
@@ -164,10 +167,17 @@ bool ListingDecides(std::string_view name) {
     if (name.empty() || name.back() == '.' || name.back() == ' ') return false;
     for (char c : name) {
         switch (c) {
-        case '~': case ':': case '*': case '?': case '"': case '<': case '>': case '|':
-            return false;
-        default:
-            if (static_cast<unsigned char>(c) >= 0x80) return false;
+            case '~':
+            case ':':
+            case '*':
+            case '?':
+            case '"':
+            case '<':
+            case '>':
+            case '|':
+                return false;
+            default:
+                if (static_cast<unsigned char>(c) >= 0x80) return false;
         }
     }
     return true;
@@ -186,7 +196,7 @@ bool PathListingDecides(std::string_view value) {
 // The node of a folder path ("" for the mod folder), made part by part when it is new.
 int FolderNode(MeshPathPlan& plan, std::string_view folder) {
     if (folder.empty()) return 0;
-    int& known = plan.names.FindOrAdd(FolderPaths, folder, -1);
+    const int known = plan.names.Find(FolderPaths, folder, NameTable::Hash(FolderPaths, folder));
     if (known >= 0) return known;
     int node = 0;
     for (std::size_t start = 0; start <= folder.size();) {
@@ -196,12 +206,12 @@ int FolderNode(MeshPathPlan& plan, std::string_view folder) {
         if (node == child) plan.nodes.push_back({parent, 0});
         start = slash + 1;
     }
-    // Looked up again: the table may have grown since.
-    return plan.names.FindOrAdd(FolderPaths, folder, -1) = node;
+    return plan.names.FindOrAdd(FolderPaths, folder, node);
 }
 
 // The file of a value, made when it is new; values that are the same byte for byte share one.
-int FileOf(MeshPathPlan& plan, std::string_view value, std::unordered_map<std::string_view, int>& unjudgedFiles) {
+int FileOf(MeshPathPlan& plan, std::string_view value,
+           std::unordered_map<std::string_view, int>& unjudgedFiles) {
     const int added = static_cast<int>(plan.files.size());
     if (!PathListingDecides(value)) {
         auto [it, fresh] = unjudgedFiles.try_emplace(value, added);

@@ -237,8 +237,8 @@ std::string MatchLetterCase(const std::string& path) {
         return NameInFolder(known->second, std::string_view(path).substr(slash + 1));
     std::string matched = path.substr(0, rootLength);
     std::size_t start = rootLength;
-    for (std::size_t end = parent.empty() ? 0 : parent.rfind('/'); end != std::string::npos && end > rootLength;
-         end = path.rfind('/', end - 1)) {
+    for (std::size_t end = parent.empty() ? 0 : parent.rfind('/');
+         end != std::string::npos && end > rootLength; end = path.rfind('/', end - 1)) {
         auto above = MatchedFolders.find(path.substr(0, end));
         if (above == MatchedFolders.end()) continue;
         if (IsFolder(above->second)) {
@@ -247,7 +247,8 @@ std::string MatchLetterCase(const std::string& path) {
         }
         break;
     }
-    std::vector<std::pair<std::size_t, std::size_t>> folders;  // where a folder part ends, in path and in matched
+    // Where each folder part ends, in path and in matched.
+    std::vector<std::pair<std::size_t, std::size_t>> folders;
     while (start < path.size()) {
         std::size_t end = std::min(path.find('/', start), path.size());
         std::string_view part(path.data() + start, end - start);
@@ -286,7 +287,8 @@ int OpenHost(const std::string& programPath, int flags, std::string& host) {
     // In a folder matched before, the name as written is what a match finds whenever it opens; only
     // when it does not are the folder and the name checked the long way.
     const std::size_t slash = host.rfind('/');
-    auto known = slash == std::string::npos ? MatchedFolders.end() : MatchedFolders.find(host.substr(0, slash));
+    auto known =
+        slash == std::string::npos ? MatchedFolders.end() : MatchedFolders.find(host.substr(0, slash));
     if (known != MatchedFolders.end()) {
         std::string inKnown = known->second;
         inKnown.append(host, slash);
@@ -700,9 +702,10 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
         entries.clear();
         return Failed(host, reason);
     }
-    entries.erase(std::remove_if(entries.begin() + dots, entries.end(),
-                                 [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); }),
-                  entries.end());
+    entries.erase(
+        std::remove_if(entries.begin() + dots, entries.end(),
+                       [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); }),
+        entries.end());
     std::sort(entries.begin() + dots, entries.end(),
               [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     return Succeeded();
