@@ -8,10 +8,12 @@
 #include <cstdio>
 #include <cstring>
 #include <dirent.h>
+#include <fcntl.h>
 #include <functional>
 #include <set>
 #include <string>
 #include <sys/stat.h>
+#include <unistd.h>
 #include <vector>
 
 namespace {
@@ -74,8 +76,10 @@ bool WriteFindings(const BaselineInput& input, const char* name, const char* hea
 
 //--- the catalogue checks
 
-// Every folder under the folder listed once, through the system's plain directory calls.
-long long ListFoldersBelow(const std::string& folder) {
+// Every folder under the folder listed once, through the system's plain directory calls; with
+// openFiles each other entry is also opened, checked for a plain file and closed, as the mesh search
+// opens each mesh it finds.
+long long ListFoldersBelow(const std::string& folder, bool openFiles) {
     DIR* listing = opendir(folder.c_str());
     if (!listing) return 0;
     long long entries = 0;
@@ -88,16 +92,27 @@ long long ListFoldersBelow(const std::string& folder) {
         bool isFolder = entry->d_type == DT_DIR ||
                         (entry->d_type == DT_UNKNOWN && lstat((folder + "/" + name).c_str(), &status) == 0 &&
                          S_ISDIR(status.st_mode));
-        if (isFolder) below.push_back(folder + "/" + name);
+        if (isFolder) {
+            below.push_back(folder + "/" + name);
+        } else if (openFiles) {
+            int file = open((folder + "/" + name).c_str(), O_RDONLY | O_NONBLOCK | O_CLOEXEC);
+            if (file >= 0 && fstat(file, &status) == 0 && S_ISREG(status.st_mode)) ++entries;
+            if (file >= 0) close(file);
+        }
     }
     closedir(listing);
-    for (const std::string& child : below) entries += ListFoldersBelow(child);
+    for (const std::string& child : below) entries += ListFoldersBelow(child, openFiles);
     return entries;
 }
 
-// The other floor, of the mesh search: the mods tree listed once.
+// The other floors, of the mesh search: the mods tree listed once, and with each file opened once.
 bool ListModFolders(const BaselineInput& input) {
-    std::printf("%lld\n", ListFoldersBelow(input.modsRoot));
+    std::printf("%lld\n", ListFoldersBelow(input.modsRoot, false));
+    return true;
+}
+
+bool ListModFoldersOpeningFiles(const BaselineInput& input) {
+    std::printf("%lld\n", ListFoldersBelow(input.modsRoot, true));
     return true;
 }
 
@@ -569,6 +584,7 @@ bool RunBaseline(const std::string& name, const BaselineInput& input) {
     const std::pair<const char*, std::function<bool(const BaselineInput&)>> baselines[] = {
         {"floor", CountLines},
         {"listing-floor", ListModFolders},
+        {"open-floor", ListModFoldersOpeningFiles},
         {"pairwise", PairwiseDoubles},
         {"prefix-table", PrefixTable},
         {"bare-keys", BareKeys},

@@ -8,6 +8,7 @@
 
 #include <algorithm>
 #include <chrono>
+#include <filesystem>
 #include <random>
 
 namespace {
@@ -85,8 +86,8 @@ TEST_F(MeshFolderSearchTest, BarCountsEveryEntryOncePerSearchedFolder) {
 // Random trees with folders in other letter cases, decoys and odd path names: the search must give
 // the plain search's flags, lines and bar moves, with fewer opens.
 TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {
-    const Strings names = {"a.sim", "B.sim", "live.sim", "dead.SIM", "x"};
-    const Strings folders = {"Buildings", "buildings", "Sea", "Pier", "m.sim"};
+    const Strings names = {"a.sim", "A.sim", "B.sim", "live.sim", "dead.SIM", "x"};
+    const Strings folders = {"Buildings", "buildings", "Sea", "Zone", "zONE", "m.sim"};
     const Strings meshFolders = {"3do", "3DO", "3Do", "3do_old", "3d0"};
     for (unsigned seed = 1; seed <= 6; ++seed) {
         std::mt19937 random(seed);
@@ -138,17 +139,32 @@ TEST_F(MeshFolderSearchTest, MatchesThePlainSearchOnRandomTrees) {
     }
 }
 
+// A folder matched in another letter case is taken again only while it is there: renamed, it is
+// matched anew, for a file in it and for one below it that no search opened before.
+TEST_F(MeshFolderSearchTest, AFolderMatchedBeforeCountsOnlyWhileItIsThere) {
+    Mesh("mods/Pack/3DO/a/x.sim");
+    Mesh("mods/Pack/3DO/b/y.sim");
+    std::vector<MeshIndexEntry> index = {Entry("Title Mods", "3do\\a\\x.sim")};
+    SearchModMeshFolders(index, ModsRoot(), NewBar());
+    ASSERT_EQ(Flags(index), "100 ");
+    std::filesystem::rename(Host("Game/mods/Pack/3DO"), Host("Game/mods/Pack/3dO"));
+    index = {Entry("Title Mods", "3do\\a\\x.sim", "3do\\b\\y.sim")};
+    SearchModMeshFolders(index, ModsRoot(), NewBar());
+    EXPECT_EQ(Flags(index), "110 ");
+}
+
 // Mod folders come in the order in which NTFS lists them: names compared as upper case, so "_" and
-// "[" sort after every letter.
+// "[" sort after every letter, after "." (the mods folder itself) and "..", which come first.
 TEST_F(MeshFolderSearchTest, ModFoldersInTheOrderNtfsListsThem) {
-    for (const std::string mod : {"_Late", "zeta", "Alpha", "[x]", "beta"})
+    for (const std::string mod : {"_Late", "zeta", "Alpha", "[x]", "beta", "(old)"})
         Write("Game/mods/" + mod + "/3do/a", "");
+    Write("Game/mods/3do/a", "");
     ProgressListOn = true;
     OpenProgressList();
     std::vector<MeshIndexEntry> index;
     SearchModMeshFolders(index, ModsRoot(), NewBar());
     Strings expected;
-    for (const std::string mod : {"Alpha", "beta", "zeta", "[x]", "_Late"})
+    for (const std::string mod : {".", "(old)", "Alpha", "beta", "zeta", "[x]", "_Late"})
         expected.push_back("Check: ...\\mods\\" + mod + "\\3do");
     EXPECT_EQ(ProgressLines(), expected);
 }

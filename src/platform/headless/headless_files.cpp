@@ -152,7 +152,14 @@ std::size_t RootLength(const std::string& host) {
 // The host path of a program path with "." and ".." taken by their text, as Windows takes them, so
 // that no part of it needs the disk; linear in its parts.
 std::string TextualHostPath(const std::string& programPath) {
-    std::string host = HeadlessHostPath(FullProgramPath(programPath));
+    // One copy of the path, as every open and listing comes through here.
+    std::string host;
+    if (!IsAbsoluteProgramPath(programPath)) {
+        host.reserve(Current.size() + 1 + programPath.size());
+        host.append(Current).append(1, '\\');
+    }
+    host += programPath;
+    std::replace(host.begin(), host.end(), '\\', '/');
     const std::size_t rootLength = RootLength(host);
     // Most paths have no part to take out: they are their own textual path.
     std::string_view rest = std::string_view(host).substr(rootLength);
@@ -220,7 +227,7 @@ std::string NameInFolder(const std::string& folder, std::string_view part) {
 
 // A textual host path with each missing part replaced by the entry that matches it in another letter
 // case. Part by part up to the first part that nothing matches, as nothing is below a missing folder;
-// a folder matched once is taken again while it is there.
+// a folder matched once is taken again while it is there, and the walk starts below the nearest one.
 std::string MatchLetterCase(const std::string& path) {
     const std::size_t rootLength = RootLength(path);
     const std::size_t slash = path.rfind('/');
@@ -229,7 +236,20 @@ std::string MatchLetterCase(const std::string& path) {
     if (known != MatchedFolders.end() && IsFolder(known->second))
         return NameInFolder(known->second, std::string_view(path).substr(slash + 1));
     std::string matched = path.substr(0, rootLength);
-    for (std::size_t start = rootLength; start < path.size();) {
+    std::size_t start = rootLength;
+    for (std::size_t end = parent.empty() ? 0 : parent.rfind('/');
+         end != std::string::npos && end > rootLength; end = path.rfind('/', end - 1)) {
+        auto above = MatchedFolders.find(path.substr(0, end));
+        if (above == MatchedFolders.end()) continue;
+        if (IsFolder(above->second)) {
+            matched = above->second;
+            start = end + 1;
+        }
+        break;
+    }
+    // Where each folder part ends, in path and in matched.
+    std::vector<std::pair<std::size_t, std::size_t>> folders;
+    while (start < path.size()) {
         std::size_t end = std::min(path.find('/', start), path.size());
         std::string_view part(path.data() + start, end - start);
         start = end + 1;
@@ -237,14 +257,18 @@ std::string MatchLetterCase(const std::string& path) {
         std::size_t folderEnd = matched.size();
         if (!matched.empty() && matched.back() != '/') matched += '/';
         matched += part;
-        if (Exists(matched)) continue;
-        std::string match = CaseMatch(folder, part);
-        if (match.empty()) return matched + path.substr(std::min(end, path.size()));
-        matched.resize(folderEnd);
-        if (!matched.empty() && matched.back() != '/') matched += '/';
-        matched += match;
+        if (!Exists(matched)) {
+            std::string match = CaseMatch(folder, part);
+            if (match.empty()) return matched + path.substr(std::min(end, path.size()));
+            matched.resize(folderEnd);
+            if (!matched.empty() && matched.back() != '/') matched += '/';
+            matched += match;
+        }
+        if (end < path.size()) folders.emplace_back(end, matched.size());
     }
-    if (!parent.empty()) MatchedFolders[parent] = matched.substr(0, matched.rfind('/'));
+    for (auto [pathEnd, matchedEnd] : folders)
+        if (pathEnd == parent.size() || path.compare(0, pathEnd, matched, 0, matchedEnd) != 0)
+            MatchedFolders[path.substr(0, pathEnd)] = matched.substr(0, matchedEnd);
     return matched;
 }
 
@@ -260,6 +284,20 @@ int OpenHost(const std::string& programPath, int flags, std::string& host) {
     host = TextualHostPath(programPath);
     int descriptor = open(host.c_str(), flags, 0666);
     if (descriptor >= 0 || errno != ENOENT) return descriptor;
+    // In a folder matched before, the name as written is what a match finds whenever it opens; only
+    // when it does not are the folder and the name checked the long way.
+    const std::size_t slash = host.rfind('/');
+    auto known =
+        slash == std::string::npos ? MatchedFolders.end() : MatchedFolders.find(host.substr(0, slash));
+    if (known != MatchedFolders.end()) {
+        std::string inKnown = known->second;
+        inKnown.append(host, slash);
+        descriptor = open(inKnown.c_str(), flags, 0666);
+        if (descriptor >= 0) {
+            host = std::move(inKnown);
+            return descriptor;
+        }
+    }
     std::string matched = MatchLetterCase(host);
     if (matched == host) return descriptor;
     host = matched;
@@ -341,7 +379,7 @@ bool ReadFolder(const std::string& host, std::vector<FolderEntry>& found) {
         if (name == "." || name == "..") continue;
         bool isFolder = entry->d_type == DT_DIR;
         if (entry->d_type == DT_LNK || entry->d_type == DT_UNKNOWN) isFolder = IsFolder(host + "/" + name);
-        found.push_back({name, isFolder});
+        found.push_back({std::move(name), isFolder});
         errno = 0;
     }
     int error = errno;
@@ -403,7 +441,7 @@ bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
 #endif
 
 // Holds a descriptor that must be a plain file, which a report created anew is emptied to.
-Handle Remember(int descriptor, const std::string& name, const std::string& host, bool emptied) {
+Handle Remember(int descriptor, const std::string& name, std::string host, bool emptied) {
     struct stat status {};
     if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) ||
         (emptied && EmptyDescriptor(descriptor) != 0)) {
@@ -414,8 +452,8 @@ Handle Remember(int descriptor, const std::string& name, const std::string& host
     OpenFile file;
     file.descriptor = descriptor;
     file.bareName = BareName(name);
-    file.hostPath = host;
-    Files[++LastFileHandle] = file;
+    file.hostPath = std::move(host);
+    Files.emplace_hint(Files.end(), ++LastFileHandle, std::move(file));
     Succeeded();
     return LastFileHandle;
 }
@@ -498,7 +536,7 @@ Handle OpenForReading(const std::string& name) {
     if (IsInjected(Faults.failOpen, name)) return Failed(ResolveHost(name), InjectedFault);
     int descriptor = OpenHost(name, ReadFlags, host);
     if (descriptor < 0) return Failed(host, SystemReason());
-    return Remember(descriptor, name, host, false);
+    return Remember(descriptor, name, std::move(host), false);
 }
 
 Handle CreateForWriting(const std::string& name) {
@@ -661,15 +699,21 @@ bool ListFolder(const std::string& pattern, std::vector<FolderEntry>& entries) {
                                                      : pattern.substr(0, slash);
     std::string filter = slash == std::string::npos ? pattern : pattern.substr(slash + 1);
     std::string host = TextualHostPath(folder);
-    std::vector<FolderEntry> found;
-    bool listed = ReadFolder(host, found);
-    if (!listed && errno == ENOENT) listed = ReadFolder(host = MatchLetterCase(host), found);
-    if (!listed) return Failed(host, IsFolder(host) ? SystemReason() : NoFolderReason(host));
-    std::erase_if(found, [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); });
-    std::sort(found.begin(), found.end(),
-              [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     if (MatchesPattern(".", filter)) entries.push_back({".", true});
     if (MatchesPattern("..", filter)) entries.push_back({"..", true});
-    entries.insert(entries.end(), found.begin(), found.end());
+    const auto dots = static_cast<std::ptrdiff_t>(entries.size());
+    bool listed = ReadFolder(host, entries);
+    if (!listed && errno == ENOENT) listed = ReadFolder(host = MatchLetterCase(host), entries);
+    if (!listed) {
+        const std::string reason = IsFolder(host) ? SystemReason() : NoFolderReason(host);
+        entries.clear();
+        return Failed(host, reason);
+    }
+    entries.erase(
+        std::remove_if(entries.begin() + dots, entries.end(),
+                       [&filter](const FolderEntry& entry) { return !MatchesPattern(entry.name, filter); }),
+        entries.end());
+    std::sort(entries.begin() + dots, entries.end(),
+              [](const FolderEntry& a, const FolderEntry& b) { return LessIgnoringCase(a.name, b.name); });
     return Succeeded();
 }
