@@ -292,7 +292,7 @@ bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, Share
     }
     ExcludeStandardTitles(shared.index.entries, [&shared](const std::string& line) {
         AddProgressLine(line);
-        shared.progressLines.push_back(line);
+        if (shared.forASecondCheck) shared.progressLines.push_back(line);
     });
     shared.made = true;
     return true;

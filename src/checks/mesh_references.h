@@ -67,6 +67,7 @@ CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std:
 struct SharedMeshIndex {
     bool made = false;
     MeshIndex index;
+    bool forASecondCheck = false;            // keeps the lines below for it
     std::vector<std::string> progressLines;  // making it gave these; the second check shows them again
 };
 // The same with the index of an earlier check of the run; findings is the number of missing meshes,

@@ -61,6 +61,7 @@ std::string ProgramFolder(const std::string& hostFolder) {
 }  // namespace
 
 int main(int argc, char** argv) {
+    InitPlatform();
     CliOptions options;
     std::string error;
     if (!ParseCliOptions(std::vector<std::string>(argv + 1, argv + argc), options, error)) {

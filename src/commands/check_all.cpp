@@ -42,7 +42,8 @@ const CheckStep Steps[] = {
                                            meshIndex, findings);
      }},
     {"missing-objects --all-maps", "Missing_objects_all_maps.txt",
-     [](const CommandInput& input, SharedMeshIndex&, int& findings) {
+     [](const CommandInput& input, SharedMeshIndex& meshIndex, int& findings) {
+         meshIndex = SharedMeshIndex();  // the mesh checks are done: their index goes before the names come
          AllMapsCount count;
          CommandResult result = CheckAllMaps(input.catalogueFolder, input.mapsFolder, count);
          findings = count.namesMissing + count.notMaps;
@@ -63,6 +64,7 @@ CommandResult CheckAll(const CommandInput& input) {
     // Each check reads the catalogue on its own, a block at a time; one that does not read whole is
     // told of once, here, rather than by every check.
     SharedMeshIndex meshIndex;
+    meshIndex.forASecondCheck = true;
     bool read = CatalogueReadsWhole(input.catalogueFolder, CantOpenCatalogue);
     bool failed = !read, found = false;
     int total = 0;
