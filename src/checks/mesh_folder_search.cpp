@@ -321,7 +321,8 @@ void CountVisits(VisitCounter& counter, std::size_t visits, Handle bar) {
     counter.visits += static_cast<int>(visits);
 }
 
-void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar) {
+void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar,
+                          bool showFolders) {
     MeshPathPlan plan;
     PlanMeshPaths(index, plan);
     const std::string shown = ShownModsRoot(modsRoot);
@@ -338,7 +339,7 @@ void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string&
         for (const FolderEntry& meshFolder : inMod) {
             if (!meshFolder.isFolder || LowerCopy(meshFolder.name) != "3do") continue;
             DrainPendingEvents();
-            if (ProgressListOn) AddProgressLine("Check: " + shown + mod.name + "\\3do");
+            if (ProgressListOn && showFolders) AddProgressLine("Check: " + shown + mod.name + "\\3do");
             for (int file : plan.unjudged) TryFile(plan, file, modFolder);
             folder = modFolder;
             WalkFolder(plan, 0, folder, inMod, modFolder);

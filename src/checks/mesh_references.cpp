@@ -11,7 +11,6 @@
 #include "output/reports.h"
 
 #include <algorithm>
-#include <deque>
 #include <string_view>
 #include <unordered_map>
 
@@ -97,8 +96,6 @@ void AddBlockStart(const MeshIndexEntry& entry, const LineSink& add) {
 
 // Every set mesh with its result.
 bool ListMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink& add) {
-    AddLines({" ", StepRuler, "Starting output", " "}, add);
-    DrainOnePendingEvent();
     bool reported = false;
     for (const MeshIndexEntry& entry : index) {
         if (entry.title.empty()) continue;
@@ -119,7 +116,6 @@ bool ListMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink&
             reported = reported || !entry.meshDeadFound;
         }
     }
-    if (!reported) add("No missing Meshs found");
     return reported;
 }
 
@@ -141,8 +137,66 @@ bool WriteMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink
         if (liveMissing) add(FoundLine("MeshLive", entry.meshLive, false));
         if (deadMissing) add(FoundLine("MeshDead", entry.meshDead, false));
     }
-    if (!reported) add("No wrong references found");
     return reported;
+}
+
+bool WriteSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
+    bool reported = false;
+    for (const MeshIndexEntry& entry : index) {
+        if (!SharesLiveDeadMesh(entry)) continue;
+        reported = true;
+        add(EntryRuler);
+        // The list joins the object line and the section name; the report keeps them apart.
+        if (output == MeshOutput::ProgressList) {
+            add(ObjectLine(entry).append(entry.sectionName));
+        } else {
+            add(ObjectLine(entry));
+            add(std::string(entry.sectionName));
+        }
+        add(std::string("MeshLive: ").append(entry.meshLive));
+        add(std::string("MeshDead: ").append(entry.meshDead));
+    }
+    return reported;
+}
+
+// One output of a check, the progress list or the report's body, given a window of the index at a
+// time: its opening lines before the first, its closing line after the last.
+struct MeshOutputRun {
+    MeshCheck check;
+    MeshOutput output;
+    LineSink add;
+    bool reported = false;
+};
+
+void OpenMeshOutput(const MeshOutputRun& run) {
+    if (run.check == MeshCheck::SharedLiveDeadMeshes) {
+        AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, run.add);
+    } else if (run.output == MeshOutput::ProgressList) {
+        AddLines({" ", StepRuler, "Starting output", " "}, run.add);
+        DrainOnePendingEvent();
+    }
+}
+
+void AddMeshWindow(MeshOutputRun& run, const std::vector<MeshIndexEntry>& window) {
+    bool reported = run.check == MeshCheck::SharedLiveDeadMeshes ? WriteSharedLiveDeadMeshes(window, run.output, run.add)
+                    : run.output == MeshOutput::ProgressList      ? ListMissingMeshes(window, run.add)
+                                                                  : WriteMissingMeshes(window, run.add);
+    run.reported = run.reported || reported;
+}
+
+void CloseMeshOutput(const MeshOutputRun& run) {
+    if (run.reported) return;
+    run.add(run.check == MeshCheck::SharedLiveDeadMeshes ? "No doubled used Meshs found"
+            : run.output == MeshOutput::ProgressList     ? "No missing Meshs found"
+                                                         : "No wrong references found");
+}
+
+bool WholeMeshOutput(const std::vector<MeshIndexEntry>& index, MeshCheck check, MeshOutput output, const LineSink& add) {
+    MeshOutputRun run{check, output, add};
+    OpenMeshOutput(run);
+    AddMeshWindow(run, index);
+    CloseMeshOutput(run);
+    return run.reported;
 }
 
 }  // namespace
@@ -155,44 +209,65 @@ bool CutMeshValue(std::string_view line, std::string& value) {
     return true;
 }
 
-// The entries are gathered where growing moves none of them, then moved once into an index of
-// their own size: a vector grown by doubling would hold up to three times the entries at once.
-MeshIndex BuildMeshIndex(LineReader& reader) {
-    MeshIndex index;
-    std::deque<MeshIndexEntry> entries;
-    std::string_view line, title;
-    std::string value;
-    bool grouped = false;
+void WalkMeshLines(LineReader& reader, const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
+                   const std::function<void(const MeshSlot& slot, std::string_view line)>& onMeshLine) {
+    std::string_view line;
+    std::string title;
+    bool grouped = false, headed = false;
     while (!grouped && NextCatalogueLine(reader, line)) grouped = line == GroupMarker;
     // Only the first group's title line keeps its blanks; every later one is trimmed.
-    if (grouped && NextPhysicalLine(reader, line)) title = index.text.Keep(line);
+    if (grouped && NextPhysicalLine(reader, line)) title = line;
     while (grouped && NextCatalogueLine(reader, line)) {
         // Markers and headers begin with "[", mesh keys with "M": most lines of a big catalogue
         // are passed over at their first byte.
         if (line.empty() || (line[0] != '[' && line[0] != 'M')) continue;
         if (line == GroupMarker) {
-            title = NextCatalogueLine(reader, line) ? index.text.Keep(line) : std::string_view();
+            title = NextCatalogueLine(reader, line) ? line : std::string_view();
         } else if (IsBuildingHeader(line)) {
-            MeshIndexEntry entry;
-            entry.title = title;
-            entry.sectionName = index.text.Keep(SectionNameByEnds(line));
-            entry.number = static_cast<int>(entries.size());
-            entries.push_back(entry);
-        } else if (entries.empty()) {
-            continue;  // keys before the first header belong to no entry
-        } else {
+            if (!onHeader(title, line)) return;
+            headed = true;
+        } else if (headed) {  // keys before the first header belong to no entry
             const MeshSlot* slot = StartsWith(line, "Mesh ")      ? &MeshSlots[0]
                                    : StartsWith(line, "MeshLive") ? &MeshSlots[1]
                                    : StartsWith(line, "MeshDead") ? &MeshSlots[2]
                                                                   : nullptr;
-            if (slot && CutMeshValue(line, value)) entries.back().*slot->value = index.text.Keep(value);
+            if (slot) onMeshLine(*slot, line);
         }
     }
-    index.entries.reserve(entries.size());
-    while (!entries.empty()) {
-        index.entries.push_back(entries.front());
-        entries.pop_front();
-    }
+}
+
+// A window's room is made at once, so that the index never grows by doubling.
+MeshIndex BuildMeshIndex(LineReader& reader, std::size_t first, std::size_t limit) {
+    MeshIndex index;
+    if (limit != SIZE_MAX) index.entries.reserve(limit);
+    std::size_t headers = 0;
+    std::string keptTitle;
+    std::string_view title;
+    std::string value;
+    bool inWindow = false;
+    WalkMeshLines(
+        reader,
+        [&](std::string_view groupTitle, std::string_view header) {
+            if (headers >= first && headers - first == limit) {
+                index.whole = false;
+                return false;
+            }
+            inWindow = headers++ >= first;
+            if (!inWindow) return true;
+            if (index.entries.empty() || groupTitle != keptTitle) {
+                keptTitle = groupTitle;
+                title = index.text.Keep(groupTitle);
+            }
+            MeshIndexEntry entry;
+            entry.title = title;
+            entry.sectionName = index.text.Keep(SectionNameByEnds(header));
+            entry.number = static_cast<int>(headers - 1);
+            index.entries.push_back(entry);
+            return true;
+        },
+        [&](const MeshSlot& slot, std::string_view line) {
+            if (inWindow && CutMeshValue(line, value)) index.entries.back().*slot.value = index.text.Keep(value);
+        });
     return index;
 }
 
@@ -216,42 +291,29 @@ void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& a
 }
 
 bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
-    return output == MeshOutput::ProgressList ? ListMissingMeshes(index, add)
-                                              : WriteMissingMeshes(index, add);
+    return WholeMeshOutput(index, MeshCheck::MissingMeshes, output, add);
 }
 
 bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
                                 const LineSink& add) {
-    const bool list = output == MeshOutput::ProgressList;
-    AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, add);
-    bool reported = false;
-    for (const MeshIndexEntry& entry : index) {
-        if (!SharesLiveDeadMesh(entry)) continue;
-        reported = true;
-        add(EntryRuler);
-        // The list joins the object line and the section name; the report keeps them apart.
-        if (list) {
-            add(ObjectLine(entry).append(entry.sectionName));
-        } else {
-            add(ObjectLine(entry));
-            add(std::string(entry.sectionName));
-        }
-        add(std::string("MeshLive: ").append(entry.meshLive));
-        add(std::string("MeshDead: ").append(entry.meshDead));
-    }
-    if (!reported) add("No doubled used Meshs found");
-    return reported;
+    return WholeMeshOutput(index, MeshCheck::SharedLiveDeadMeshes, output, add);
 }
 
 namespace {
 
+const std::string ReportHeading[] = {
+    "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked",
+    "Mod objects using sims/meshes of standard objects will cause wrong alert"};
+
 struct MeshRun {
+    std::size_t windowEntries = MeshWindowEntries;
     Handle waitWindow = 0;
     Handle bar = 0;
 };
 
-MeshRun StartMeshRun() {
+MeshRun StartMeshRun(std::size_t windowEntries) {
     MeshRun run;
+    run.windowEntries = windowEntries;
     run.waitWindow = OpenWindowOrEnd("Wait", 400, 340, 180, 40, FrameStyle{});
     run.bar = AddProgressBar(run.waitWindow, 10, 10, 160, 20, 0, 35);
     if (ProgressListOn) {
@@ -273,78 +335,152 @@ int CountMeshFindings(const std::vector<MeshIndexEntry>& index, MeshCheck check)
     return findings;
 }
 
-// The run's index, read from the catalogue unless an earlier check of the run made it; false, with
-// the Wait window closed and the user told, when the catalogue could not be read whole.
+// A window of the index read from static.ini; false when it could not be read whole.
+bool ReadMeshWindow(const MeshRun& run, const std::string& catalogueFolder, std::size_t first, MeshIndex& window,
+                    FileRead& read) {
+    LineReader catalogue;
+    read = OpenLines(catalogueFolder, "static.ini", catalogue);
+    if (read != FileRead::Whole) return false;
+    window = BuildMeshIndex(catalogue, first, run.windowEntries);
+    if (catalogue.ReadFailed()) read = FileRead::FailedPartway;
+    return read == FileRead::Whole;
+}
+
+// The exclusion steps of a catalogue larger than a window. One read keeps the names of as many
+// standard entries as a window holds; a title whose names did not all fit is read again on its own.
+// False when a read failed.
+bool ListStandardTitlesByReading(const MeshRun& run, const std::string& catalogueFolder, const LineSink& add) {
+    auto readHeaders = [&](const std::function<void(std::size_t title, std::string_view header)>& onHeader) {
+        LineReader catalogue;
+        if (OpenLines(catalogueFolder, "static.ini", catalogue) != FileRead::Whole) return false;
+        WalkMeshLines(
+            catalogue,
+            [&](std::string_view title, std::string_view header) {
+                auto standard = std::find(StandardTitles.begin(), StandardTitles.end(), title);
+                if (standard != StandardTitles.end()) onHeader(standard - StandardTitles.begin(), header);
+                return true;
+            },
+            [](const MeshSlot&, std::string_view) {});
+        return !catalogue.ReadFailed();
+    };
+    TextStore kept;
+    std::size_t keptNames = 0;
+    std::vector<std::vector<std::string_view>> names(StandardTitles.size());
+    std::vector<bool> allKept(StandardTitles.size(), true);
+    bool whole = readHeaders([&](std::size_t title, std::string_view header) {
+        if (keptNames++ < run.windowEntries) names[title].push_back(kept.Keep(SectionNameByEnds(header)));
+        else allKept[title] = false;
+    });
+    AddLines({StepRuler, "Excluding Standard Titles", " "}, add);
+    for (std::size_t t = 0; whole && t < StandardTitles.size(); ++t) {
+        AddLines({StepRuler, "Excluding " + StandardTitles[t], " "}, add);
+        DrainPendingEvents();
+        if (allKept[t]) {
+            for (std::string_view name : names[t]) add("Excluding " + std::string(name));
+            continue;
+        }
+        whole = readHeaders([&](std::size_t title, std::string_view header) {
+            if (title == t) add("Excluding " + std::string(SectionNameByEnds(header)));
+        });
+    }
+    return whole;
+}
+
+// The run's first window, from the catalogue unless an earlier check of the run kept a whole index,
+// with the exclusion steps; false, with the Wait window closed and the user told, when the catalogue
+// could not be read whole.
 bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, SharedMeshIndex& shared) {
-    if (shared.made) {
+    if (shared.made && shared.index.whole) {
         if (ProgressListOn)
             for (const std::string& line : shared.progressLines) AddProgressLine(line);
         return true;
     }
-    LineReader catalogue;
-    FileRead read = OpenLines(catalogueFolder, "static.ini", catalogue);
-    if (read == FileRead::Whole) shared.index = BuildMeshIndex(catalogue);
-    if (read == FileRead::Whole && catalogue.ReadFailed()) read = FileRead::FailedPartway;
+    LineSink add = [&shared](const std::string& line) {
+        AddProgressLine(line);
+        if (shared.forASecondCheck) shared.progressLines.push_back(line);
+    };
+    FileRead read = FileRead::Whole;
+    bool whole = ReadMeshWindow(run, catalogueFolder, 0, shared.index, read);
+    if (whole && !shared.index.whole && ProgressListOn && !ListStandardTitlesByReading(run, catalogueFolder, add))
+        read = FileRead::FailedPartway;
     if (read != FileRead::Whole) {
         CloseTopWindow(run.waitWindow);
         TellCatalogueFailure(read, CantOpenCatalogue);
         return false;
     }
-    ExcludeStandardTitles(shared.index.entries, [&shared](const std::string& line) {
-        AddProgressLine(line);
-        if (shared.forASecondCheck) shared.progressLines.push_back(line);
-    });
-    shared.made = true;
+    if (shared.index.whole) {
+        ExcludeStandardTitles(shared.index.entries, add);
+        shared.made = true;
+    } else {
+        ExcludeStandardTitles(shared.index.entries, [](const std::string&) {});
+    }
     return true;
 }
 
-CommandResult FinishMeshRun(const MeshRun& run, const std::string& modsRoot, MeshCheck check,
-                            SharedMeshIndex& shared, int& findings) {
+CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogueFolder, const std::string& modsRoot,
+                            MeshCheck check, SharedMeshIndex& shared, int& findings) {
     const bool missingMode = check == MeshCheck::MissingMeshes;
-    std::vector<MeshIndexEntry>& index = shared.index.entries;
     if (ProgressListOn) {
         DrainPendingEvents();
         AddLines({" ", StepRuler, "Searching folders & files", " "});
         DrainPendingEvents();
     }
-    if (missingMode) {
-        SearchModMeshFolders(index, modsRoot, run.bar);
-        if (ProgressListOn) ReportMissingMeshes(index, MeshOutput::ProgressList, AddProgressLine);
-    } else if (ProgressListOn) {
-        ReportSharedLiveDeadMeshes(index, MeshOutput::ProgressList, AddProgressLine);
-    }
-    CloseTopWindow(run.waitWindow);
-
+    // The report is begun with the first window and told of, when it could not be made, at the end.
     ReportFile report;
-    if (!CreateReport(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report))
-        return CommandResult::Failed;
-    WriteReportLine(
-        report,
-        "Obects sorted within standard titles (example: 'Title Furniture') up to 4.09b are not checked");
-    WriteReportLine(report, "Mod objects using sims/meshes of standard objects will cause wrong alert");
-    WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:"
-                                        : "Doubled used sims in your static.ini:");
+    bool made = CreateReportSilently(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report);
+    for (const std::string& line : ReportHeading) WriteReportLine(report, line);
+    WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:" : "Doubled used sims in your static.ini:");
     WriteReportLine(report, "");
-    LineSink toReport = [&report](const std::string& line) { WriteReportLine(report, line); };
-    bool reported = missingMode ? ReportMissingMeshes(index, MeshOutput::ReportBody, toReport)
-                                : ReportSharedLiveDeadMeshes(index, MeshOutput::ReportBody, toReport);
-    findings = CountMeshFindings(index, check);
+    MeshOutputRun list{check, MeshOutput::ProgressList, AddProgressLine};
+    MeshOutputRun body{check, MeshOutput::ReportBody, [&report](const std::string& line) { WriteReportLine(report, line); }};
+    OpenMeshOutput(body);
+
+    MeshIndex later;  // a window after the first, when the catalogue has more than one
+    MeshIndex* window = &shared.index;
+    for (bool first = true;; first = false) {
+        if (missingMode) SearchModMeshFolders(window->entries, modsRoot, run.bar, first);
+        if (ProgressListOn && first) OpenMeshOutput(list);
+        if (ProgressListOn) AddMeshWindow(list, window->entries);
+        AddMeshWindow(body, window->entries);
+        findings += CountMeshFindings(window->entries, check);
+        if (window->whole) break;
+        std::size_t next = static_cast<std::size_t>(window->entries.back().number) + 1;
+        *window = MeshIndex();  // gone before the next window comes in
+        FileRead read = FileRead::Whole;
+        if (!ReadMeshWindow(run, catalogueFolder, next, later, read)) {
+            CloseTopWindow(run.waitWindow);
+            DiscardReport(report);
+            TellCatalogueFailure(FileRead::FailedPartway, {});
+            return CommandResult::Failed;
+        }
+        ExcludeStandardTitles(later.entries, [](const std::string&) {});
+        window = &later;
+    }
+    if (ProgressListOn) CloseMeshOutput(list);
+    CloseTopWindow(run.waitWindow);
+    CloseMeshOutput(body);
+    if (!made) {
+        TellReportFailure(report.fileName);
+        return CommandResult::Failed;
+    }
     if (!FinishReport(report)) return CommandResult::Failed;
-    return reported ? CommandResult::Findings : CommandResult::NothingFound;
+    return body.reported ? CommandResult::Findings : CommandResult::NothingFound;
 }
 
 }  // namespace
 
-CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check) {
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check,
+                                  std::size_t windowEntries) {
     int findings = 0;
     SharedMeshIndex index;
-    return CheckMeshReferencesSharing(catalogueFolder, modsRoot, check, index, findings);
+    return CheckMeshReferencesSharing(catalogueFolder, modsRoot, check, index, findings, windowEntries);
 }
 
 CommandResult CheckMeshReferencesSharing(const std::string& catalogueFolder, const std::string& modsRoot,
-                                         MeshCheck check, SharedMeshIndex& index, int& findings) {
+                                         MeshCheck check, SharedMeshIndex& index, int& findings,
+                                         std::size_t windowEntries) {
     findings = 0;
-    MeshRun run = StartMeshRun();
+    MeshRun run = StartMeshRun(windowEntries);
     if (!MakeMeshIndex(run, catalogueFolder, index)) return CommandResult::Failed;
-    return FinishMeshRun(run, modsRoot, check, index, findings);
+    return FinishMeshRun(run, catalogueFolder, modsRoot, check, index, findings);
 }

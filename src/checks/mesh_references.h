@@ -8,6 +8,7 @@
 #include "output/command_result.h"
 #include "output/progress_list.h"
 
+#include <cstdint>
 #include <functional>
 #include <string>
 #include <string_view>
@@ -42,12 +43,20 @@ bool CutMeshValue(std::string_view line, std::string& value);
 
 using LineSink = std::function<void(const std::string&)>;
 
-// One entry per building header after the first group marker, with the text its entries view.
+// Walks the catalogue after its first group marker: each building header with its group's title,
+// and each mesh key line with the slot it sets in the entry of the header before it.
+// onHeader ends the walk by returning false.
+void WalkMeshLines(LineReader& catalogue, const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
+                   const std::function<void(const MeshSlot& slot, std::string_view line)>& onMeshLine);
+
+// The entries of building headers after the first group marker, from the first-th on and as many
+// as the limit, with the text they view.
 struct MeshIndex {
     std::vector<MeshIndexEntry> entries;
     TextStore text;
+    bool whole = true;  // the catalogue has no entry after them
 };
-MeshIndex BuildMeshIndex(LineReader& catalogue);
+MeshIndex BuildMeshIndex(LineReader& catalogue, std::size_t first = 0, std::size_t limit = SIZE_MAX);
 // Empties the title of every entry in a standard title group; later steps pass over such entries.
 // While the progress list is on, the steps go to the sink.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add = AddProgressLine);
@@ -60,10 +69,15 @@ bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOu
                                 const LineSink& add);
 
 enum class MeshCheck { MissingMeshes, SharedLiveDeadMeshes };
+// How many entries a run holds at once, with their text and the search's plan: a catalogue with
+// more is read again for every further window, and searched again.
+const std::size_t MeshWindowEntries = 1 << 17;
 // The whole run of one of the two checks; modsRoot ends in "\". Always writes and opens its report.
-CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check);
-// The index of one catalogue, made by the first check that needs it and kept for the other: neither
-// check reads what the other changes (the missing check sets found flags only).
+CommandResult CheckMeshReferences(const std::string& catalogueFolder, const std::string& modsRoot, MeshCheck check,
+                                  std::size_t windowEntries = MeshWindowEntries);
+// The index of one catalogue, made by the first check that needs it and kept for the other when it
+// fits in one window: neither check reads what the other changes (the missing check sets found
+// flags only).
 struct SharedMeshIndex {
     bool made = false;
     MeshIndex index;
@@ -73,4 +87,5 @@ struct SharedMeshIndex {
 // The same with the index of an earlier check of the run; findings is the number of missing meshes,
 // or of entries whose live and dead meshes are one file.
 CommandResult CheckMeshReferencesSharing(const std::string& catalogueFolder, const std::string& modsRoot,
-                                         MeshCheck check, SharedMeshIndex& index, int& findings);
+                                         MeshCheck check, SharedMeshIndex& index, int& findings,
+                                         std::size_t windowEntries = MeshWindowEntries);

@@ -14,7 +14,8 @@ passed=0 failed=0
 limit_kb=$((64 * 1024))
 
 # 1,600,000 objects in 75 MB: each with a number line, an empty mesh key and an irregular line;
-# every fourth name is doubled, so that the doubled check needs more than one window.
+# every fourth name is doubled, so that the doubled check needs more than one window, and the mesh
+# checks need thirteen.
 objects="$work/mods/std/com/maddox/il2/objects"
 mkdir -p "$objects" "$work/reports" "$work/mods/mapmods/maps"
 awk 'BEGIN { printf "[***]\r\nTitle Mods\r\n"
@@ -36,7 +37,8 @@ check() {
     fi
     cp "$work/catalogue" "$objects/static.ini"
 }
-for command in doubled-objects irregular-entries empty-references renumber denumber fmb-list fmb-plus-list; do
+for command in doubled-objects irregular-entries empty-references renumber denumber fmb-list fmb-plus-list \
+    wrong-sim-references doubled-used-sims check-all; do
     check "$command" "$command"
 done
 check "missing-objects --all-maps" missing-objects --all-maps

@@ -77,7 +77,7 @@ TEST_F(AllMapsTest, SmallWindowsFindWhatOneWindowFinds) {
         AllMapsCount count;
         EXPECT_EQ(CheckAllMaps(CatalogueFolder, Folder(maps), count, window), CommandResult::Findings);
         EXPECT_EQ(AllMapsSummary(count), "3 maps checked, 2 with missing objects, 2 names missing, 1 not map files");
-        return Desktop("Missing_objects_all_maps.txt") + "|" + testing::PrintToString(ProgressLines());
+        return Desktop("Missing_objects_all_maps.txt") + "|" + CrLf(ProgressLines());
     };
     const std::string whole = run(NameWindow());
     EXPECT_NE(whole.find("Map: Coast\\actors.static\r\nbuildings.House$X\r\n\r\nMap: Hills"), std::string::npos);

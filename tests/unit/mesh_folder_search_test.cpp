@@ -1,4 +1,5 @@
 #include "checks/mesh_folder_search.h"
+#include "checks/mesh_references.h"
 
 #include "plain_mesh_search.h"
 #include "platform/headless/headless.h"
@@ -187,4 +188,43 @@ TEST_F(MeshFolderSearchTest, OddValuesDoNotStallTheSearch) {
         << "each Many folder, the 3DO one's mod, the root climbed to";
     EXPECT_FALSE(MakeFolderCurrent(Folder("Game") + deep));
     EXPECT_LT(std::chrono::duration<double>(std::chrono::steady_clock::now() - start).count(), 5);
+}
+
+// However few entries a window holds, both checks, alone or sharing an index as check-all does,
+// give what one window gives: the progress lines, the report and the result.
+TEST_F(MeshFolderSearchTest, SmallWindowsCheckAsOneWindowDoes) {
+    UseCatalogue(CrLf({"Mesh 3do/before.sim", "[***]", "Title House", "[buildings.House$Std]", "Mesh 3do/std.sim",
+                       "[***]", "Title Mods", "[buildings.House$A]", "Mesh 3do/a.sim", "MeshLive 3do/a.sim",
+                       "MeshDead 3do/a.sim", "[buildings.House$B]", "MeshLive 3do/b/l.sim", "MeshDead 3do/b/d.sim",
+                       "[***]", "Title Humans", "[buildings.House$H]", "Mesh 3do/h.sim", "[***]", "Title House",
+                       "[buildings.House$Std2]", "[***]", "Title Mods", "[buildings.House$C]", "Mesh 3do/C.SIM",
+                       "[buildings.House$E]"}),
+                 "Game/mods/std/com/maddox/il2/objects");
+    Mesh("mods/Pack/3do/a.sim");
+    Mesh("mods/Pack/3do/b/d.sim");
+    Mesh("mods/Pack/3do/c.sim");
+    ProgressListOn = true;
+    auto run = [&](std::size_t window) {
+        std::string outputs;
+        SharedMeshIndex shared;
+        shared.forASecondCheck = true;
+        for (MeshCheck check : {MeshCheck::MissingMeshes, MeshCheck::SharedLiveDeadMeshes}) {
+            for (bool sharing : {false, true}) {
+                OpenProgressList();
+                int findings = 0;
+                CommandResult result = sharing ? CheckMeshReferencesSharing(CatalogueFolder, ModsRoot(), check,
+                                                                            shared, findings, window)
+                                               : CheckMeshReferences(CatalogueFolder, ModsRoot(), check, window);
+                outputs += std::to_string(static_cast<int>(result)) + " " + std::to_string(findings) + "\n" +
+                           Desktop(check == MeshCheck::MissingMeshes ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt") +
+                           CrLf(ProgressLines());
+            }
+        }
+        return outputs;
+    };
+    const std::string whole = run(MeshWindowEntries);
+    EXPECT_NE(whole.find("Not found: MeshLive 3do\\b\\l.sim"), std::string::npos);
+    EXPECT_NE(whole.find("Excluding buildings.House$Std2"), std::string::npos);
+    EXPECT_NE(whole.find("Check: ...\\mods\\Pack\\3do"), std::string::npos);
+    for (std::size_t window : {1, 2, 3, 5}) EXPECT_EQ(run(window), whole) << window << " entries a window";
 }
