@@ -321,12 +321,16 @@ void CountVisits(VisitCounter& counter, std::size_t visits, Handle bar) {
     counter.visits += static_cast<int>(visits);
 }
 
+void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar) {
+    VisitCounter visits;
+    SearchModMeshFolders(index, modsRoot, bar, visits, true);
+}
+
 void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar,
-                          bool showFolders) {
+                          VisitCounter& counter, bool showFolders) {
     MeshPathPlan plan;
     PlanMeshPaths(index, plan);
     const std::string shown = ShownModsRoot(modsRoot);
-    VisitCounter counter;
     std::vector<FolderEntry> mods;
     if (!ListFolder(modsRoot + "*.*", mods)) return;
     std::string folder;

@@ -21,7 +21,9 @@ void CountVisits(VisitCounter& counter, std::size_t visits, Handle bar);
 
 // Walks the mods root ("." and ".." included) and each folder in it with a 3do folder; a set mesh of
 // an entry that has a title is found when the file opens in one of those folders. Shows a "Check: "
-// line per searched folder, unless told not to (for a later window of a large catalogue), and
-// drains events as it goes.
+// line per searched folder, unless told not to (for a later window of a large catalogue), counts the
+// visits on, and drains events as it goes.
 void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar,
-                          bool showFolders = true);
+                          VisitCounter& visits, bool showFolders);
+// The same for an index that is the whole catalogue.
+void SearchModMeshFolders(std::vector<MeshIndexEntry>& index, const std::string& modsRoot, Handle bar);

@@ -309,6 +309,7 @@ struct MeshRun {
     std::size_t windowEntries = MeshWindowEntries;
     Handle waitWindow = 0;
     Handle bar = 0;
+    VisitCounter visits;  // counted on over the windows, so the bar moves as for one
 };
 
 MeshRun StartMeshRun(std::size_t windowEntries) {
@@ -417,7 +418,7 @@ bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, Share
     return true;
 }
 
-CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogueFolder, const std::string& modsRoot,
+CommandResult FinishMeshRun(MeshRun& run, const std::string& catalogueFolder, const std::string& modsRoot,
                             MeshCheck check, SharedMeshIndex& shared, int& findings) {
     const bool missingMode = check == MeshCheck::MissingMeshes;
     if (ProgressListOn) {
@@ -438,7 +439,7 @@ CommandResult FinishMeshRun(const MeshRun& run, const std::string& catalogueFold
     MeshIndex later;  // a window after the first, when the catalogue has more than one
     MeshIndex* window = &shared.index;
     for (bool first = true;; first = false) {
-        if (missingMode) SearchModMeshFolders(window->entries, modsRoot, run.bar, first);
+        if (missingMode) SearchModMeshFolders(window->entries, modsRoot, run.bar, run.visits, first);
         if (ProgressListOn && first) OpenMeshOutput(list);
         if (ProgressListOn) AddMeshWindow(list, window->entries);
         AddMeshWindow(body, window->entries);

@@ -228,3 +228,22 @@ TEST_F(MeshFolderSearchTest, SmallWindowsCheckAsOneWindowDoes) {
     EXPECT_NE(whole.find("Check: ...\\mods\\Pack\\3do"), std::string::npos);
     for (std::size_t window : {1, 2, 3, 5}) EXPECT_EQ(run(window), whole) << window << " entries a window";
 }
+
+// The Wait window's bar counts on over the windows: it moves as for one window.
+TEST_F(MeshFolderSearchTest, BarMovesOverWindowsAsForOne) {
+    Strings catalogue = {"[***]", "Title Mods"};
+    for (int entry = 0; entry < 2000; ++entry) catalogue.push_back("[buildings.House$F" + std::to_string(entry) + "]");
+    UseCatalogue(CrLf(catalogue), "Game/mods/std/com/maddox/il2/objects");
+    for (const char* mod : {"A", "B", "C"}) Write("Game/mods/" + std::string(mod) + "/3do/readme", "");
+    auto barMoves = [&](std::size_t window) {
+        Handle bar = 0;
+        HeadlessPushPending([&bar] {
+            bar = HeadlessControlByKind(HeadlessFindWindow("Wait"), "progress");
+            return Event();
+        });
+        CheckMeshReferences(CatalogueFolder, ModsRoot(), MeshCheck::MissingMeshes, window);
+        return HeadlessControlOf(bar)->positionsSet;
+    };
+    EXPECT_EQ(barMoves(MeshWindowEntries), BarMovesAfter(2000LL * 3));
+    EXPECT_EQ(barMoves(700), BarMovesAfter(2000LL * 3));
+}
