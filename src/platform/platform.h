@@ -108,8 +108,8 @@ bool MakeFolderCurrent(const std::string& folder);
 std::string CurrentFolder();  // as the system gives it, without a trailing "\" added
 
 Handle OpenForReading(const std::string& name);
-// Creates or empties a plain file for writing. Anything else at the name (a link, a folder, a pipe,
-// a device) is never opened for writing: 0 comes back.
+// Creates or empties a plain file for writing. Anything else at the name (a link, hard or symbolic,
+// a folder, a pipe, a device) is never opened for writing: 0 comes back.
 Handle CreateForWriting(const std::string& name);
 // The file's size when it was opened, so that it can be read whole into one block; 0 when unknown.
 std::size_t FileSizeOf(Handle file);

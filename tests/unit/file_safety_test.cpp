@@ -84,6 +84,19 @@ TEST_F(FileSafetyTest, LinksAndPipesAtTheTemporaryFileOrAReportAreNeverWrittenNo
             EXPECT_EQ(Status(c.at).st_mode & S_IFMT, isPipe ? S_IFIFO : S_IFLNK);
         }
     }
+    // A hard link: a report is not written through it; static.ini.tmp as one is a dead run's
+    // leftover, whose name alone goes.
+    for (const Case& c : {Case{"fmb-list", "Desktop/Static_list_FMB.txt", "Report failure: Can't write Static_list_FMB.txt"},
+                          Case{"renumber", Objects + "static.ini.tmp", ""}}) {
+        SCOPED_TRACE(c.at + " hard link");
+        Restart();
+        UseCatalogue(Catalogue);
+        Write("stranger.txt", "theirs");
+        fs::create_hard_link(Host("stranger.txt"), Host(c.at));
+        EXPECT_EQ(Run(c.command), c.message.empty() ? CommandResult::Done : CommandResult::Failed);
+        EXPECT_EQ(Messages(), c.message.empty() ? Strings{"Renumber static.ini: Done"} : Strings{c.message});
+        EXPECT_EQ(Read("stranger.txt"), "theirs");
+    }
     for (const char* command : {"doubled-objects", "renumber"}) {  // a pipe as the catalogue itself
         fs::remove(Host(Objects + "static.ini"));
         ASSERT_EQ(mkfifo(Host(Objects + "static.ini").c_str(), 0600), 0);

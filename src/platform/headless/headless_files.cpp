@@ -443,9 +443,11 @@ bool MoveIntoPlace(const std::string& source, ClaimedFile& claimed) {
 // Holds a descriptor that must be a plain file, which a report created anew is emptied to.
 Handle Remember(int descriptor, const std::string& name, std::string host, bool emptied) {
     struct stat status {};
-    if (fstat(descriptor, &status) != 0 || !S_ISREG(status.st_mode) ||
-        (emptied && EmptyDescriptor(descriptor) != 0)) {
-        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : NotPlainFile);
+    bool plain = fstat(descriptor, &status) == 0 && S_ISREG(status.st_mode);
+    // A second name of a file is as much a planted link as a symbolic one: never written through.
+    bool linked = plain && emptied && status.st_nlink > 1;
+    if (!plain || linked || (emptied && EmptyDescriptor(descriptor) != 0)) {
+        Failed(host, S_ISDIR(status.st_mode) ? SystemReason(EISDIR) : linked ? "a link" : NotPlainFile);
         close(descriptor);
         return 0;
     }

@@ -171,9 +171,10 @@ Handle CreateForWriting(const std::string& name) {
                               FILE_ATTRIBUTE_NORMAL | FILE_FLAG_OPEN_REPARSE_POINT, nullptr);
     if (file == INVALID_HANDLE_VALUE) return 0;
     BY_HANDLE_FILE_INFORMATION information;
+    // A second name of a file (a hard link) is as much a planted link as a reparse point.
     if (GetFileType(file) != FILE_TYPE_DISK || !GetFileInformationByHandle(file, &information) ||
         (information.dwFileAttributes & (FILE_ATTRIBUTE_DIRECTORY | FILE_ATTRIBUTE_REPARSE_POINT)) ||
-        !SetEndOfFile(file)) {
+        information.nNumberOfLinks > 1 || !SetEndOfFile(file)) {
         CloseHandle(file);
         return 0;
     }
