@@ -27,7 +27,8 @@ NameTable FirstPlaces(const std::vector<std::string_view>& names) {
 HeldNames::HeldNames(NameWindow window) : limits(window) { bytes.reserve(limits.nameBytes); }
 
 bool HoldName(HeldNames& held, std::string_view name) {
-    bool full = held.names.size() == held.limits.names || held.bytes.size() + name.size() > held.bytes.capacity();
+    bool full = held.names.size() == held.limits.names ||
+                held.bytes.size() + name.size() > held.bytes.capacity();
     if (full && !held.names.empty()) return false;
     std::size_t at = held.bytes.size();
     held.bytes.append(name);

@@ -84,7 +84,8 @@ long long PairDoubledNames(const CataloguePass& openPass, NameWindow limits,
 }
 
 std::string DoubledObjectLine(const NamedObject& object) {
-    std::string line = "Double object (" + std::to_string(object.index) + ") => (" + std::to_string(object.next) + "): ";
+    std::string line =
+        "Double object (" + std::to_string(object.index) + ") => (" + std::to_string(object.next) + "): ";
     return line.append(object.name);
 }
 
@@ -96,7 +97,7 @@ CommandResult FindDoubledObjects(const std::string& catalogueFolder, int& findin
     const std::string ruler(67, '*');
     FindingsWriter writer{{"Doubled_objects.txt", "Doubled objects in your static.ini:", "No doubled objects",
                            "No doubled objects found in your static.ini"}};
-    long long objects = PairDoubledNames(PassesOver(catalogueFolder, first), NameWindow(), [&](const NamedObject& object) {
+    auto show = [&](const NamedObject& object) {
         if (ProgressListOn) {
             DrainPendingEvents();
             AddProgressLine("Build (" + std::to_string(object.index) + ") " + std::string(object.name));
@@ -110,7 +111,8 @@ CommandResult FindDoubledObjects(const std::string& catalogueFolder, int& findin
             AddProgressLine(ruler);
         }
         AddFinding(writer, line);
-    });
+    };
+    long long objects = PairDoubledNames(PassesOver(catalogueFolder, first), NameWindow(), show);
     if (objects < 0) {
         TellCatalogueFailure(FileRead::FailedPartway, {});
         return FinishFindings(writer, false);

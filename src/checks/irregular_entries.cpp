@@ -69,7 +69,8 @@ std::string_view RegularLinePrefixOf(std::string_view line) {
     return {};
 }
 
-void JudgeCatalogueLines(LineReader& catalogue, bool keepRegular, const std::function<void(const JudgedLine&)>& sink) {
+void JudgeCatalogueLines(LineReader& catalogue, bool keepRegular,
+                         const std::function<void(const JudgedLine&)>& sink) {
     int objectNumber = 0;
     std::string_view line;
     while (NextCatalogueLine(catalogue, line)) {

@@ -19,7 +19,8 @@ struct JudgedLine {
 std::string_view RegularLinePrefixOf(std::string_view line);
 // Gives the non-empty catalogue lines to the sink in file order with their verdicts; the regular
 // ones only when keepRegular is set.
-void JudgeCatalogueLines(LineReader& catalogue, bool keepRegular, const std::function<void(const JudgedLine&)>& sink);
+void JudgeCatalogueLines(LineReader& catalogue, bool keepRegular,
+                         const std::function<void(const JudgedLine&)>& sink);
 std::string IrregularEntryLine(const JudgedLine& entry);
 
 // The check on static.ini in the folder; findings is the number of irregular lines.

@@ -112,7 +112,8 @@ bool ListMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink&
         }
         if (IsSet(entry.meshDead)) {
             // The list has always written this one with a capital F.
-            add(std::string(entry.meshDeadFound ? "Found: MeshDead " : "Not Found: MeshDead ").append(entry.meshDead));
+            std::string found = entry.meshDeadFound ? "Found: MeshDead " : "Not Found: MeshDead ";
+            add(found.append(entry.meshDead));
             reported = reported || !entry.meshDeadFound;
         }
     }
@@ -140,7 +141,8 @@ bool WriteMissingMeshes(const std::vector<MeshIndexEntry>& index, const LineSink
     return reported;
 }
 
-bool WriteSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
+bool WriteSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
+                               const LineSink& add) {
     bool reported = false;
     for (const MeshIndexEntry& entry : index) {
         if (!SharesLiveDeadMesh(entry)) continue;
@@ -178,9 +180,10 @@ void OpenMeshOutput(const MeshOutputRun& run) {
 }
 
 void AddMeshWindow(MeshOutputRun& run, const std::vector<MeshIndexEntry>& window) {
-    bool reported = run.check == MeshCheck::SharedLiveDeadMeshes ? WriteSharedLiveDeadMeshes(window, run.output, run.add)
-                    : run.output == MeshOutput::ProgressList      ? ListMissingMeshes(window, run.add)
-                                                                  : WriteMissingMeshes(window, run.add);
+    bool reported = run.check == MeshCheck::SharedLiveDeadMeshes
+                        ? WriteSharedLiveDeadMeshes(window, run.output, run.add)
+                    : run.output == MeshOutput::ProgressList ? ListMissingMeshes(window, run.add)
+                                                             : WriteMissingMeshes(window, run.add);
     run.reported = run.reported || reported;
 }
 
@@ -191,7 +194,8 @@ void CloseMeshOutput(const MeshOutputRun& run) {
                                                          : "No wrong references found");
 }
 
-bool WholeMeshOutput(const std::vector<MeshIndexEntry>& index, MeshCheck check, MeshOutput output, const LineSink& add) {
+bool WholeMeshOutput(const std::vector<MeshIndexEntry>& index, MeshCheck check, MeshOutput output,
+                     const LineSink& add) {
     MeshOutputRun run{check, output, add};
     OpenMeshOutput(run);
     AddMeshWindow(run, index);
@@ -209,7 +213,8 @@ bool CutMeshValue(std::string_view line, std::string& value) {
     return true;
 }
 
-void WalkMeshLines(LineReader& reader, const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
+void WalkMeshLines(LineReader& reader,
+                   const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
                    const std::function<void(const MeshSlot& slot, std::string_view line)>& onMeshLine) {
     std::string_view line;
     std::string title;
@@ -266,7 +271,8 @@ MeshIndex BuildMeshIndex(LineReader& reader, std::size_t first, std::size_t limi
             return true;
         },
         [&](const MeshSlot& slot, std::string_view line) {
-            if (inWindow && CutMeshValue(line, value)) index.entries.back().*slot.value = index.text.Keep(value);
+            if (inWindow && CutMeshValue(line, value))
+                index.entries.back().*slot.value = index.text.Keep(value);
         });
     return index;
 }
@@ -402,8 +408,8 @@ bool MakeMeshIndex(const MeshRun& run, const std::string& catalogueFolder, Share
     };
     FileRead read = FileRead::Whole;
     bool whole = ReadMeshWindow(run, catalogueFolder, 0, shared.index, read);
-    if (whole && !shared.index.whole && ProgressListOn && !ListStandardTitlesByReading(run, catalogueFolder, add))
-        read = FileRead::FailedPartway;
+    bool listedByReading = whole && !shared.index.whole && ProgressListOn;
+    if (listedByReading && !ListStandardTitlesByReading(run, catalogueFolder, add)) read = FileRead::FailedPartway;
     if (read != FileRead::Whole) {
         CloseTopWindow(run.waitWindow);
         TellCatalogueFailure(read, CantOpenCatalogue);
@@ -430,10 +436,12 @@ CommandResult FinishMeshRun(MeshRun& run, const std::string& catalogueFolder, co
     ReportFile report;
     bool made = CreateReportSilently(missingMode ? "Missing_3do.txt" : "Doubled_sims_or_meshes.txt", report);
     for (const std::string& line : ReportHeading) WriteReportLine(report, line);
-    WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:" : "Doubled used sims in your static.ini:");
+    WriteReportLine(report, missingMode ? "Wrong sim references in your static.ini:"
+                                        : "Doubled used sims in your static.ini:");
     WriteReportLine(report, "");
     MeshOutputRun list{check, MeshOutput::ProgressList, AddProgressLine};
-    MeshOutputRun body{check, MeshOutput::ReportBody, [&report](const std::string& line) { WriteReportLine(report, line); }};
+    LineSink toReport = [&report](const std::string& line) { WriteReportLine(report, line); };
+    MeshOutputRun body{check, MeshOutput::ReportBody, toReport};
     OpenMeshOutput(body);
 
     MeshIndex later;  // a window after the first, when the catalogue has more than one

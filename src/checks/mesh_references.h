@@ -46,7 +46,8 @@ using LineSink = std::function<void(const std::string&)>;
 // Walks the catalogue after its first group marker: each building header with its group's title,
 // and each mesh key line with the slot it sets in the entry of the header before it.
 // onHeader ends the walk by returning false.
-void WalkMeshLines(LineReader& catalogue, const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
+void WalkMeshLines(LineReader& catalogue,
+                   const std::function<bool(std::string_view title, std::string_view header)>& onHeader,
                    const std::function<void(const MeshSlot& slot, std::string_view line)>& onMeshLine);
 
 // The entries of building headers after the first group marker, from the first-th on and as many

@@ -43,7 +43,8 @@ void CollectMapFiles(const std::vector<FolderEntry>& entries, const std::string&
 
 // A map lists a name it places many times once, at its first placement: a builder wants to know
 // what to add, not how often it stands on the map.
-std::vector<std::string> MissingNamesOnce(const std::vector<std::string>& mapNames, const std::vector<bool>& defined) {
+std::vector<std::string> MissingNamesOnce(const std::vector<std::string>& mapNames,
+                                          const std::vector<bool>& defined) {
     std::vector<std::string> missing;
     std::vector<std::string_view> seenNames;
     seenNames.reserve(mapNames.size());
@@ -149,7 +150,8 @@ CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string
         SkipBuildingHeaders(catalogue, first);
         HeldNames window(limits);
         bool ended = true;
-        ForEachBuildingSectionName(catalogue, [&](std::string_view name) { ended = ended && HoldName(window, name); });
+        ForEachBuildingSectionName(catalogue,
+                                   [&](std::string_view name) { ended = ended && HoldName(window, name); });
         if (!ReadToTheEnd(catalogue)) return CommandResult::Failed;
         if (first == 0) {
             std::vector<std::string> mapFiles;
@@ -163,7 +165,8 @@ CommandResult CheckAllMaps(const std::string& catalogueFolder, const std::string
         }
         for (MapPlaces& map : maps)
             if (map.isMap)
-                MarkDefinedNames(map, ExtractMapObjectNames(ReadMapFileText(map.folder, map.fileName)), window, held);
+                MarkDefinedNames(map, ExtractMapObjectNames(ReadMapFileText(map.folder, map.fileName)), window,
+                                 held);
         first += static_cast<long long>(window.names.size());
     }
 }

@@ -104,7 +104,8 @@ bool IsNumberLine(std::string_view line) {
 }
 
 // The progress list shows this pass as the denumbering.
-void RewriteCatalogue(LineReader& catalogue, Numbering numbering, const std::function<void(std::string_view)>& sink) {
+void RewriteCatalogue(LineReader& catalogue, Numbering numbering,
+                      const std::function<void(std::string_view)>& sink) {
     long long number = 0;
     std::string_view line;
     while (NextPhysicalLine(catalogue, line)) {

@@ -22,7 +22,8 @@ enum class Numbering { Renumber, Denumber };
 // renumbering, a fresh one counting from 0 above every line that begins with "[bui". Every other
 // line is kept byte for byte, ending in CR LF. Each line left out or kept goes to the progress list
 // while it is on.
-void RewriteCatalogue(LineReader& catalogue, Numbering numbering, const std::function<void(std::string_view)>& sink);
+void RewriteCatalogue(LineReader& catalogue, Numbering numbering,
+                      const std::function<void(std::string_view)>& sink);
 
 // static.ini is replaced in one step by the finished static.ini.tmp, or stays as it was. One run at
 // a time: a second one says so and stops.
