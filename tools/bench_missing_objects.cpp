@@ -14,6 +14,7 @@
 #include <cstdio>
 #include <filesystem>
 #include <fstream>
+#include <iterator>
 
 namespace {
 
@@ -96,8 +97,8 @@ int main(int argc, char** argv) {
     double wholeCheck = BestTime([&] { FindMissingMapObjects(mapFolder + "*" + mapName, catalogueFolder); });
 
     std::vector<std::string> names = ExtractMapObjectNames(ReadMapFileText(mapFolder, mapName));
-    std::string catalogueBytes;
-    ReadWholeFile(catalogueFolder, "static.ini", catalogueBytes);
+    std::ifstream catalogueFile(catalogue / "static.ini", std::ios::binary);
+    std::string catalogueBytes((std::istreambuf_iterator<char>(catalogueFile)), std::istreambuf_iterator<char>());
     std::vector<std::string> sectionNames;
     LineReader catalogueLines = LinesOf(catalogueBytes);
     ForEachBuildingSectionName(catalogueLines, [&](std::string_view name) { sectionNames.emplace_back(name); });

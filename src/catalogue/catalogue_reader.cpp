@@ -111,26 +111,6 @@ FileRead OpenLines(const std::string& folder, const std::string& fileName, LineR
     return FileRead::Whole;
 }
 
-FileRead ReadWholeFile(const std::string& folder, const std::string& fileName, std::string& bytes) {
-    const std::size_t blockSize = 1 << 16;
-    bytes.clear();
-    if (!MakeFolderCurrent(folder)) return FileRead::NotOpened;
-    Handle file = OpenForReading(fileName);
-    if (file == 0) return FileRead::NotOpened;
-    // One block for the whole file: growing it as it fills would copy it over and over.
-    bytes.reserve(FileSizeOf(file) + blockSize);
-    for (;;) {
-        std::size_t filled = bytes.size();
-        bytes.resize(filled + blockSize);
-        std::size_t got = ReadBytes(file, bytes.data() + filled, blockSize);
-        bytes.resize(filled + got);
-        if (got == 0) break;
-    }
-    bool failed = ReadHasFailed(file);
-    CloseFile(file);
-    return failed ? FileRead::FailedPartway : FileRead::Whole;
-}
-
 std::string_view TrimBlanks(std::string_view line) {
     std::size_t first = line.find_first_not_of(' ');
     if (first == std::string_view::npos) return {};

@@ -59,8 +59,6 @@ enum class FileRead {
 };
 // Makes the folder current and opens the file there by its bare name; NotOpened or Whole.
 FileRead OpenLines(const std::string& folder, const std::string& fileName, LineReader& reader);
-// Makes the folder current and reads the file there, opened by its bare name, to its end.
-FileRead ReadWholeFile(const std::string& folder, const std::string& fileName, std::string& bytes);
 
 std::string_view TrimBlanks(std::string_view line);
 bool IsBuildingHeader(std::string_view line);

@@ -161,48 +161,6 @@ bool WriteSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOut
     return reported;
 }
 
-// One output of a check, the progress list or the report's body, given a window of the index at a
-// time: its opening lines before the first, its closing line after the last.
-struct MeshOutputRun {
-    MeshCheck check;
-    MeshOutput output;
-    LineSink add;
-    bool reported = false;
-};
-
-void OpenMeshOutput(const MeshOutputRun& run) {
-    if (run.check == MeshCheck::SharedLiveDeadMeshes) {
-        AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, run.add);
-    } else if (run.output == MeshOutput::ProgressList) {
-        AddLines({" ", StepRuler, "Starting output", " "}, run.add);
-        DrainOnePendingEvent();
-    }
-}
-
-void AddMeshWindow(MeshOutputRun& run, const std::vector<MeshIndexEntry>& window) {
-    bool reported = run.check == MeshCheck::SharedLiveDeadMeshes
-                        ? WriteSharedLiveDeadMeshes(window, run.output, run.add)
-                    : run.output == MeshOutput::ProgressList ? ListMissingMeshes(window, run.add)
-                                                             : WriteMissingMeshes(window, run.add);
-    run.reported = run.reported || reported;
-}
-
-void CloseMeshOutput(const MeshOutputRun& run) {
-    if (run.reported) return;
-    run.add(run.check == MeshCheck::SharedLiveDeadMeshes ? "No doubled used Meshs found"
-            : run.output == MeshOutput::ProgressList     ? "No missing Meshs found"
-                                                         : "No wrong references found");
-}
-
-bool WholeMeshOutput(const std::vector<MeshIndexEntry>& index, MeshCheck check, MeshOutput output,
-                     const LineSink& add) {
-    MeshOutputRun run{check, output, add};
-    OpenMeshOutput(run);
-    AddMeshWindow(run, index);
-    CloseMeshOutput(run);
-    return run.reported;
-}
-
 }  // namespace
 
 bool CutMeshValue(std::string_view line, std::string& value) {
@@ -296,13 +254,28 @@ void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& a
     }
 }
 
-bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add) {
-    return WholeMeshOutput(index, MeshCheck::MissingMeshes, output, add);
+void OpenMeshOutput(const MeshOutputRun& run) {
+    if (run.check == MeshCheck::SharedLiveDeadMeshes) {
+        AddLines({" ", SharedRuler, "Using the same MeshLive/MeshDead", SharedRuler, " "}, run.add);
+    } else if (run.output == MeshOutput::ProgressList) {
+        AddLines({" ", StepRuler, "Starting output", " "}, run.add);
+        DrainOnePendingEvent();
+    }
 }
 
-bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
-                                const LineSink& add) {
-    return WholeMeshOutput(index, MeshCheck::SharedLiveDeadMeshes, output, add);
+void AddMeshWindow(MeshOutputRun& run, const std::vector<MeshIndexEntry>& window) {
+    bool reported = run.check == MeshCheck::SharedLiveDeadMeshes
+                        ? WriteSharedLiveDeadMeshes(window, run.output, run.add)
+                    : run.output == MeshOutput::ProgressList ? ListMissingMeshes(window, run.add)
+                                                             : WriteMissingMeshes(window, run.add);
+    run.reported = run.reported || reported;
+}
+
+void CloseMeshOutput(const MeshOutputRun& run) {
+    if (run.reported) return;
+    run.add(run.check == MeshCheck::SharedLiveDeadMeshes ? "No doubled used Meshs found"
+            : run.output == MeshOutput::ProgressList     ? "No missing Meshs found"
+                                                         : "No wrong references found");
 }
 
 namespace {

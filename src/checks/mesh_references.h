@@ -62,14 +62,21 @@ MeshIndex BuildMeshIndex(LineReader& catalogue, std::size_t first = 0, std::size
 // While the progress list is on, the steps go to the sink.
 void ExcludeStandardTitles(std::vector<MeshIndexEntry>& index, const LineSink& add = AddProgressLine);
 
-// Where a mode's findings go: the progress list or the report's body. Each gives its lines to the
-// sink and returns the reported flag.
-enum class MeshOutput { ProgressList, ReportBody };
-bool ReportMissingMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output, const LineSink& add);
-bool ReportSharedLiveDeadMeshes(const std::vector<MeshIndexEntry>& index, MeshOutput output,
-                                const LineSink& add);
-
 enum class MeshCheck { MissingMeshes, SharedLiveDeadMeshes };
+// Where a check's findings go: the progress list or the report's body. An output is given the
+// index a window at a time: its opening lines before the first, its closing line after the last;
+// reported tells whether any window gave findings.
+enum class MeshOutput { ProgressList, ReportBody };
+struct MeshOutputRun {
+    MeshCheck check;
+    MeshOutput output;
+    LineSink add;
+    bool reported = false;
+};
+void OpenMeshOutput(const MeshOutputRun& run);
+void AddMeshWindow(MeshOutputRun& run, const std::vector<MeshIndexEntry>& window);
+void CloseMeshOutput(const MeshOutputRun& run);
+
 // How many entries a run holds at once, with their text and the search's plan: a catalogue with
 // more is read again for every further window, and searched again.
 const std::size_t MeshWindowEntries = 1 << 17;

@@ -35,12 +35,13 @@ bool WriteSettingsFile(const std::string& folder, const std::string& startFolder
 }  // namespace
 
 bool LoadSettings(const std::string& startFolder) {
-    std::string settings;
-    if (ReadWholeFile(startFolder, SettingsFileName, settings) == FileRead::NotOpened) return true;
-    LineReader reader = LinesOf(settings);
-    std::string_view folder;
-    NextPhysicalLine(reader, folder);
-    CatalogueFolder = folder;
+    {
+        LineReader reader;
+        if (OpenLines(startFolder, SettingsFileName, reader) == FileRead::NotOpened) return true;
+        std::string_view folder;
+        NextPhysicalLine(reader, folder);
+        CatalogueFolder = folder;
+    }  // closed here: Windows deletes no open file, and verrant.ini may be deleted below
     MapsPattern = DeriveMapsPattern(CatalogueFolder);
 
     // A folder that cannot be entered holds no catalogue, even when the start folder holds one.

@@ -111,8 +111,6 @@ Handle OpenForReading(const std::string& name);
 // Creates or empties a plain file for writing. Anything else at the name (a link, hard or symbolic,
 // a folder, a pipe, a device) is never opened for writing: 0 comes back.
 Handle CreateForWriting(const std::string& name);
-// The file's size when it was opened, so that it can be read whole into one block; 0 when unknown.
-std::size_t FileSizeOf(Handle file);
 // Bytes read into buffer; 0 at the end of the file or on a failure.
 std::size_t ReadBytes(Handle file, char* buffer, std::size_t size);
 // Whether a read of this file failed: tells a failure from the end of the file.

@@ -39,11 +39,15 @@ Strings MeshIndexOf(const std::string& catalogue, bool exclude = false) {
     return described;
 }
 
-using MeshReport = bool (*)(const std::vector<MeshIndexEntry>&, MeshOutput, const LineSink&);
-// The lines one output of a mesh check gives; its reported flag must be the one expected.
-Strings Emitted(MeshReport report, const std::vector<MeshIndexEntry>& index, MeshOutput out, bool reported) {
+// The lines one output of a mesh check gives for the index as one window; its reported flag must be
+// the one expected.
+Strings Emitted(MeshCheck check, const std::vector<MeshIndexEntry>& index, MeshOutput out, bool reported) {
     Strings lines;
-    EXPECT_EQ(report(index, out, [&](const std::string& line) { lines.push_back(line); }), reported);
+    MeshOutputRun run{check, out, [&](const std::string& line) { lines.push_back(line); }};
+    OpenMeshOutput(run);
+    AddMeshWindow(run, index);
+    CloseMeshOutput(run);
+    EXPECT_EQ(run.reported, reported);
     return lines;
 }
 
@@ -232,22 +236,22 @@ TEST(Checks, MissingMeshesInTheListAndInTheReport) {
     index[2] = {"T", "LiveFound", 2, "", "3do\\l.sim", "3do\\d.sim", false, true, false};
     index[3] = {"T", "DeadOnly", 3, "", "", "3do\\d.sim", false, false, false};
     index[4] = {"T", "NoneFound", 4, "", "3do\\l.sim", "3do\\d.sim", false, false, false};  // both named
-    EXPECT_EQ(Emitted(ReportMissingMeshes, index, List, true),
+    EXPECT_EQ(Emitted(MeshCheck::MissingMeshes, index, List, true),
               Strings({" ", "//**************************", "Starting output", " ", Stars14, "Object (1)",
                        "Both", "Found: Mesh 3do\\m.sim", Stars14, "Object (1)", "Both",
                        "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)", "LiveFound",
                        "Found: MeshLive 3do\\l.sim", "Not Found: MeshDead 3do\\d.sim", Stars14, "Object (3)",
                        "DeadOnly", "Not Found: MeshDead 3do\\d.sim", Stars14, "Object (4)", "NoneFound",
                        "Not found: MeshLive 3do\\l.sim", "Not Found: MeshDead 3do\\d.sim"}));
-    EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, true),
+    EXPECT_EQ(Emitted(MeshCheck::MissingMeshes, index, Body, true),
               Strings({Stars14, "Object (1)", "Both", "Not found: MeshLive 3do\\l.sim", Stars14, "Object (2)",
                        "LiveFound", "Not found: MeshDead 3do\\d.sim", Stars14, "Object (3)", "DeadOnly",
                        "Not found: MeshDead 3do\\d.sim", Stars14, "Object (4)", "NoneFound",
                        "Not found: MeshLive 3do\\l.sim", "Not found: MeshDead 3do\\d.sim"}));
     index.resize(2);
     index[1].meshLiveFound = true;
-    EXPECT_EQ(Emitted(ReportMissingMeshes, index, Body, false), Strings({"No wrong references found"}));
-    EXPECT_EQ(Emitted(ReportMissingMeshes, index, List, false).back(), "No missing Meshs found");
+    EXPECT_EQ(Emitted(MeshCheck::MissingMeshes, index, Body, false), Strings({"No wrong references found"}));
+    EXPECT_EQ(Emitted(MeshCheck::MissingMeshes, index, List, false).back(), "No missing Meshs found");
 }
 
 TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
@@ -269,10 +273,10 @@ TEST(Checks, SharedLiveDeadMeshesInTheListAndInTheReport) {
     report.insert(report.end(), {Stars14, "Object (1)", "buildings.House$Slashes", "MeshLive: 3do\\A\\l.sim",
                                  "MeshDead: 3do\\A\\l.sim", Stars14, "Object (3)", "bui$Prefix",
                                  "MeshLive: 3do\\a.sim", "MeshDead: 3do\\a.sim"});
-    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, List, true), list);
-    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, Body, true), report);
+    EXPECT_EQ(Emitted(MeshCheck::SharedLiveDeadMeshes, index, List, true), list);
+    EXPECT_EQ(Emitted(MeshCheck::SharedLiveDeadMeshes, index, Body, true), report);
     index.resize(1);
-    EXPECT_EQ(Emitted(ReportSharedLiveDeadMeshes, index, Body, false).back(), "No doubled used Meshs found");
+    EXPECT_EQ(Emitted(MeshCheck::SharedLiveDeadMeshes, index, Body, false).back(), "No doubled used Meshs found");
 }
 
 TEST(Checks, NumberLines) {

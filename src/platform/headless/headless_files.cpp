@@ -550,13 +550,6 @@ Handle CreateForWriting(const std::string& name) {
     return Remember(descriptor, name, host, true);
 }
 
-std::size_t FileSizeOf(Handle handle) {
-    OpenFile* file = FindFile(handle);
-    struct stat status {};
-    if (!file || fstat(file->descriptor, &status) != 0) return 0;
-    return static_cast<std::size_t>(status.st_size);
-}
-
 std::size_t ReadBytes(Handle handle, char* buffer, std::size_t size) {
     OpenFile* file = FindFile(handle);
     if (!file || file->readFailed) return 0;

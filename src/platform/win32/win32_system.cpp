@@ -181,12 +181,6 @@ Handle CreateForWriting(const std::string& name) {
     return FromFile(file);
 }
 
-std::size_t FileSizeOf(Handle file) {
-    LARGE_INTEGER size;
-    if (!GetFileSizeEx(ToFile(file), &size)) return 0;
-    return static_cast<std::size_t>(size.QuadPart);
-}
-
 std::size_t ReadBytes(Handle file, char* buffer, std::size_t size) {
     if (ReadHasFailed(file)) return 0;
     std::size_t total = 0;
